@@ -1,0 +1,40 @@
+# One folder is one library, with its files listed by name, and one test program.
+
+# vantrell_library(NAME SOURCES a.cpp b.cpp LINK other_library ...)
+function(vantrell_library name)
+  cmake_parse_arguments(arg "" "" "SOURCES;LINK" ${ARGN})
+  add_library(${name} STATIC ${arg_SOURCES})
+  target_link_libraries(${name} PUBLIC vantrell_flags ${arg_LINK})
+endfunction()
+
+# vantrell_test(NAME SOURCES a_test.cpp LINK library ... LABELS label ...)
+# Every test of the program becomes a ctest of its own; TIMEOUT is in seconds.
+function(vantrell_test name)
+  if(NOT VANTRELL_BUILD_TESTS)
+    return()
+  endif()
+  cmake_parse_arguments(arg "" "TIMEOUT" "SOURCES;LINK;LABELS" ${ARGN})
+  if(NOT arg_TIMEOUT)
+    set(arg_TIMEOUT 120)
+  endif()
+  add_executable(${name} ${arg_SOURCES})
+  target_link_libraries(${name} PRIVATE vantrell_flags ${arg_LINK} GTest::gmock GTest::gtest_main)
+  foreach(source ${arg_SOURCES})
+    cmake_path(ABSOLUTE_PATH source BASE_DIRECTORY ${CMAKE_CURRENT_SOURCE_DIR} NORMALIZE)
+    set_property(GLOBAL APPEND PROPERTY VANTRELL_TEST_SOURCES ${source})
+  endforeach()
+  gtest_discover_tests(${name} DISCOVERY_MODE PRE_TEST DISCOVERY_TIMEOUT 60
+    PROPERTIES TIMEOUT ${arg_TIMEOUT} LABELS "${arg_LABELS}")
+endfunction()
+
+# A test file in no target would never run, and nobody would notice.
+function(vantrell_refuse_orphan_tests)
+  get_property(known GLOBAL PROPERTY VANTRELL_TEST_SOURCES)
+  file(GLOB_RECURSE found CONFIGURE_DEPENDS ${PROJECT_SOURCE_DIR}/src/*_test.cpp
+       ${PROJECT_SOURCE_DIR}/tests/*_test.cpp)
+  foreach(file ${found})
+    if(NOT file IN_LIST known)
+      message(FATAL_ERROR "${file} is in no test target: list it in a vantrell_test() call")
+    endif()
+  endforeach()
+endfunction()

@@ -1,0 +1,237 @@
+#include "platform/foundation/FndURL.h"
+
+#include <algorithm>
+#include <array>
+#include <mutex>
+#include <utility>
+
+namespace vantrell {
+namespace {
+
+constexpr std::string_view kFileScheme = "file://";
+constexpr std::string_view kHexDigits = "0123456789ABCDEF";
+
+// Calls `each` with every component of `path` that is neither empty nor ".".
+template <class Each>
+void forEachComponent(std::string_view path, const Each& each) {
+  while (!path.empty()) {
+    const std::size_t slash = std::min(path.find('/'), path.size());
+    const std::string_view component = path.substr(0, slash);
+    if (!component.empty() && component != ".") each(component);
+    path.remove_prefix(std::min(slash + 1, path.size()));
+  }
+}
+
+std::string cleanPath(std::string_view path) {
+  std::string clean;
+  clean.reserve(path.size() + 1);
+  forEachComponent(path, [&clean](std::string_view component) {
+    clean += '/';
+    clean += component;
+  });
+  if (clean.empty()) clean = "/";
+  return clean;
+}
+
+bool isUnreserved(char c) {
+  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
+         std::string_view("-._~/!$&'()*+,;=:@").find(c) != std::string_view::npos;
+}
+
+int hexValue(char c) {
+  if (c >= '0' && c <= '9') return c - '0';
+  if (c >= 'A' && c <= 'F') return c - 'A' + 10;
+  if (c >= 'a' && c <= 'f') return c - 'a' + 10;
+  return -1;
+}
+
+std::string percentDecoded(std::string_view text) {
+  std::string bytes;
+  for (std::size_t i = 0; i < text.size(); ++i) {
+    const bool escape = text[i] == '%' && i + 2 < text.size() && hexValue(text[i + 1]) >= 0 &&
+                        hexValue(text[i + 2]) >= 0;
+    bytes += escape ? static_cast<char>(hexValue(text[i + 1]) * 16 + hexValue(text[i + 2]))
+                    : text[i];
+    if (escape) i += 2;
+  }
+  return bytes;
+}
+
+// The length of the well-formed UTF-8 sequence at the front of `bytes`, 0 when there is none.
+std::size_t utf8SequenceLength(std::string_view bytes) {
+  const auto at = [&bytes](std::size_t i) { return static_cast<unsigned char>(bytes[i]); };
+  const unsigned char lead = at(0);
+  if (lead < 0x80) return 1;
+  const std::size_t length = lead >= 0xf0 ? 4 : lead >= 0xe0 ? 3 : 2;
+  if (lead < 0xc2 || lead > 0xf4 || bytes.size() < length) return 0;
+  for (std::size_t i = 1; i < length; ++i) {
+    if ((at(i) & 0xc0) != 0x80) return 0;
+  }
+  if (lead == 0xe0 && at(1) < 0xa0) return 0;  // overlong
+  if (lead == 0xed && at(1) > 0x9f) return 0;  // a surrogate
+  if (lead == 0xf0 && at(1) < 0x90) return 0;  // overlong
+  if (lead == 0xf4 && at(1) > 0x8f) return 0;  // beyond U+10FFFF
+  return length;
+}
+
+}  // namespace
+
+struct FndURL::Object {
+  std::string text;  // the path of a file URL, the whole text of any other
+  bool isFile = true;
+  std::mutex mutex;
+  std::vector<std::pair<FndURLResourceKey, ResourceValue>> values;  // guarded by mutex
+};
+
+std::string_view resourceKeyName(FndURLResourceKey key) {
+  static constexpr std::array<std::string_view, 14> kNames = {
+      "FndURLParentDirectoryURLKey", "FndURLNameKey",
+      "FndURLLocalizedNameKey",      "FndURLTypeIdentifierKey",
+      "FndURLFileSizeKey",           "FndURLCreationDateKey",
+      "FndURLContentModificationDateKey", "FndURLIsReadableKey",
+      "FndURLIsWritableKey",         "FndURLIsDirectoryKey",
+      "FndURLIsPackageKey",          "FndURLFileResourceIdentifierKey",
+      "FndURLDocumentIdentifierKey", "FndURLContentVersionKey"};
+  return kNames[static_cast<std::size_t>(key)];
+}
+
+FndURL FndURL::fileURLWithPath(std::string_view path) {
+  auto object = std::make_shared<Object>();
+  object->text = cleanPath(path);
+  return FndURL(std::move(object));
+}
+
+std::optional<FndURL> FndURL::URLWithString(std::string_view text) {
+  if (text.starts_with(kFileScheme)) {
+    const std::string_view rest = text.substr(kFileScheme.size());
+    const std::size_t slash = rest.find('/');  // what stands before it is a host: ours
+    if (slash == std::string_view::npos) return std::nullopt;
+    return fileURLWithPath(percentDecoded(rest.substr(slash)));
+  }
+  const std::size_t colon = text.find(':');
+  if (colon == 0 || colon == std::string_view::npos) return std::nullopt;
+  auto object = std::make_shared<Object>();
+  object->text = text;
+  object->isFile = false;
+  return FndURL(std::move(object));
+}
+
+bool FndURL::isFileURL() const { return _object->isFile; }
+
+const std::string& FndURL::path() const {
+  static const std::string kNone;
+  return _object->isFile ? _object->text : kNone;
+}
+
+std::string FndURL::standardizedPath() const {
+  std::vector<std::string_view> kept;
+  forEachComponent(path(), [&kept](std::string_view component) {
+    if (component != "..") {
+      kept.push_back(component);
+    } else if (!kept.empty()) {
+      kept.pop_back();
+    }
+  });
+  std::string result;
+  for (const std::string_view component : kept) {
+    result += '/';
+    result += component;
+  }
+  if (result.empty()) result = "/";
+  return result;
+}
+
+std::string_view FndURL::lastPathComponent() const {
+  const std::string_view text = _object->text;
+  const std::size_t slash = text.rfind('/');
+  if (slash == std::string_view::npos || text.size() == 1) return text;
+  return text.substr(slash + 1);
+}
+
+std::vector<std::string> FndURL::pathComponents() const {
+  std::vector<std::string> components;
+  if (!isFileURL()) return components;
+  components.emplace_back("/");
+  forEachComponent(path(), [&components](std::string_view c) { components.emplace_back(c); });
+  return components;
+}
+
+FndURL FndURL::URLByAppendingPathComponent(std::string_view component) const {
+  std::string joined;
+  joined.reserve(path().size() + component.size() + 1);
+  joined += path();
+  joined += '/';
+  joined += component;
+  return fileURLWithPath(joined);
+}
+
+FndURL FndURL::URLByDeletingLastPathComponent() const {
+  const std::string_view text = path();
+  const std::size_t slash = text.rfind('/');
+  return fileURLWithPath(slash == std::string_view::npos ? "/" : text.substr(0, slash));
+}
+
+std::string FndURL::description() const {
+  if (!isFileURL()) return _object->text;
+  std::string text(kFileScheme);
+  for (const char c : path()) {
+    if (isUnreserved(c)) {
+      text += c;
+    } else {
+      const auto byte = static_cast<unsigned char>(c);
+      text += '%';
+      text += kHexDigits[byte >> 4];
+      text += kHexDigits[byte & 15];
+    }
+  }
+  return text;
+}
+
+std::optional<FndURL::ResourceValue> FndURL::cachedResourceValue(FndURLResourceKey key) const {
+  const std::lock_guard lock(_object->mutex);
+  for (const auto& [known, value] : _object->values) {
+    if (known == key) return value;
+  }
+  return std::nullopt;
+}
+
+void FndURL::setCachedResourceValue(FndURLResourceKey key, ResourceValue value) const {
+  const std::lock_guard lock(_object->mutex);
+  for (auto& [known, old] : _object->values) {
+    if (known != key) continue;
+    old = std::move(value);
+    return;
+  }
+  _object->values.emplace_back(key, std::move(value));
+}
+
+bool operator==(const FndURL& a, const FndURL& b) {
+  return a._object == b._object ||
+         (a._object->isFile == b._object->isFile && a._object->text == b._object->text);
+}
+
+bool operator<(const FndURL& a, const FndURL& b) {
+  if (a._object->isFile != b._object->isFile) return a._object->isFile;
+  return a._object->text < b._object->text;
+}
+
+std::string displayText(std::string_view bytes) {
+  std::string shown;
+  shown.reserve(bytes.size());
+  while (!bytes.empty()) {
+    const auto byte = static_cast<unsigned char>(bytes.front());
+    std::size_t length = utf8SequenceLength(bytes);
+    if (length == 0 || byte < 0x20 || byte == 0x7f) {
+      shown += "\\x";
+      shown += kHexDigits[byte >> 4];
+      shown += kHexDigits[byte & 15];
+      length = 1;
+    } else {
+      shown += bytes.substr(0, length);
+    }
+    bytes.remove_prefix(length);
+  }
+  return shown;
+}
+
+}  // namespace vantrell
