@@ -31,11 +31,11 @@ struct Services {
   DochostManager* manager = nullptr;
   Clock* clock = nullptr;
 
-  Tremor* tremor = nullptr;                  ///< null: nothing records what happens
-  Appreg* appreg = nullptr;                  ///< null: no application registry
+  Tremor* tremor = nullptr;                    ///< null: nothing records what happens
+  Appreg* appreg = nullptr;                    ///< null: no application registry
   DhFileOperations* fileOperations = nullptr;  ///< null: nothing can be changed through this
-  Devinfo* devinfo = nullptr;                ///< null: nothing is known of the machine
-  Imaging* imaging = nullptr;                ///< null: no pictures
+  Devinfo* devinfo = nullptr;                  ///< null: nothing is known of the machine
+  Imaging* imaging = nullptr;                  ///< null: no pictures
 };
 
 /// Keeps the services installed; with it go the process-wide objects made meanwhile.
@@ -70,9 +70,9 @@ std::shared_ptr<void> processWide(std::type_index type,
 /// installation: a new one begins afresh.
 template <class T>
 T& processWide() {
-  return *static_cast<T*>(
-      processWide(typeid(T), [] { return std::static_pointer_cast<void>(std::make_shared<T>()); })
-          .get());
+  return *static_cast<T*>(processWide(typeid(T), [] {
+                            return std::static_pointer_cast<void>(std::make_shared<T>());
+                          }).get());
 }
 
 }  // namespace vantrell::platform

@@ -63,8 +63,7 @@ class FileIndex {
 /// True for the attributes that a document keeps when its file is replaced: names (without the
 /// "user." prefix) that end in "#PS", and the tags.
 inline bool isKeptAcrossSafeSave(std::string_view attributeName) {
-  return attributeName.ends_with("#PS") ||
-         attributeName == "com.quillon.metadata:_kMDItemUserTags";
+  return attributeName.ends_with("#PS") || attributeName == "com.quillon.metadata:_kMDItemUserTags";
 }
 
 }  // namespace vantrell::linuxos

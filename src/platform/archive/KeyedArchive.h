@@ -16,7 +16,16 @@
 namespace vantrell {
 
 /// What an archived object may be, for the reader to say which it accepts.
-enum class ArchiveClass : std::uint8_t { Null, Number, String, Date, Data, List, Dictionary, Record };
+enum class ArchiveClass : std::uint8_t {
+  Null,
+  Number,
+  String,
+  Date,
+  Data,
+  List,
+  Dictionary,
+  Record
+};
 
 /// "FndNumber", "FndString", …: the class names as archives and messages spell them.
 std::string_view archiveClassName(ArchiveClass archiveClass);
@@ -41,8 +50,7 @@ class ArchiveValue {
   explicit ArchiveValue(List value) : _value(std::make_shared<const List>(std::move(value))) {}
   explicit ArchiveValue(Dictionary value)
       : _value(std::make_shared<const Dictionary>(std::move(value))) {}
-  explicit ArchiveValue(Record value)
-      : _value(std::make_shared<const Record>(std::move(value))) {}
+  explicit ArchiveValue(Record value) : _value(std::make_shared<const Record>(std::move(value))) {}
 
   ArchiveClass archiveClass() const;
   /// A record's own class name, else the name of `archiveClass()`.

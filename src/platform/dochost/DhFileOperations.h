@@ -34,8 +34,7 @@ class DhFileOperations {
                                                   Completion completion) = 0;
   /// With bouncing, a taken name becomes "name 2.ext", "name 3.ext", … instead of a collision.
   virtual void dh_reparentUnderFolder_allowBouncing(const FndURL& item, const FndURL& folder,
-                                                    bool allowBouncing,
-                                                    Completion completion) = 0;
+                                                    bool allowBouncing, Completion completion) = 0;
   virtual void dh_trashUnderFolder(const FndURL& item, const FndURL& trashFolder,
                                    Completion completion) = 0;
   virtual void dh_delete(const FndURL& item,

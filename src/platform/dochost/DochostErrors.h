@@ -17,7 +17,8 @@ enum class DochostErrorCode : std::int64_t {
 
 /// The keys of the information in the framework's errors.
 inline constexpr std::string_view kDochostErrorItemIdentifierKey = "itemIdentifier";
-inline constexpr std::string_view kDochostErrorCollidingItemKey = "collidingItem";  // DochostItemRef
+inline constexpr std::string_view kDochostErrorCollidingItemKey =
+    "collidingItem";  // DochostItemRef
 /// In the foundation's FileWriteFileExists: the `FndURL` of what stands in the way.
 inline constexpr std::string_view kDhCollidingURLKey = "dh_collidingURL";
 

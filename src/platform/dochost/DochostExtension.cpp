@@ -69,8 +69,7 @@ void DochostExtension::renameItemWithIdentifier_toName_completionHandler(
 
 void DochostExtension::
     reparentItemWithIdentifier_toParentItemWithIdentifier_newName_completionHandler(
-        std::string_view, std::string_view, std::optional<std::string>,
-        ItemCompletion completion) {
+        std::string_view, std::string_view, std::optional<std::string>, ItemCompletion completion) {
   completion(nullptr, unsupported());
 }
 

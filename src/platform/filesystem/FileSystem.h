@@ -62,8 +62,8 @@ class FileSystem {
 
   /// Errors (of the folder itself): 260, POSIX. Errors below it go to `errorHandler`.
   virtual Result<std::unique_ptr<DirectoryEnumerator>> enumerateDirectory(
-      const FndURL& folder, std::span<const FndURLResourceKey> prefetchedKeys,
-      std::uint8_t options, DirectoryErrorHandler errorHandler) = 0;
+      const FndURL& folder, std::span<const FndURLResourceKey> prefetchedKeys, std::uint8_t options,
+      DirectoryErrorHandler errorHandler) = 0;
 
   /// Creates the folder and those above it that are missing; one that exists is no failure.
   virtual Result<void> createDirectory(const FndURL& url) = 0;

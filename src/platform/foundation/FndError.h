@@ -27,15 +27,15 @@ enum class FndFoundationErrorCode : std::int64_t {
 
 /// This system's own errors.
 enum class VantrellErrorCode : std::int64_t {
-  NotHereYet = 1,          ///< the request is known, and this version cannot answer it
-  MissingVolumeUUID = 2,   ///< the volume that holds the storage has no identity
-  NoDocumentsFolder = 3,   ///< no "Documents" component in the path: it has no trash
-  NotInTrash = 4,          ///< the item to be put back is not in the trash
-  UnknownBundle = 5,       ///< no application with that bundle identifier
-  NoValidParent = 6,       ///< nowhere to put an item back to
-  DamagedData = 7,         ///< an archive or a property list that cannot be decoded
-  InvalidArgument = 8,     ///< the caller's words are off; the message says how
-  StateUnavailable = 9,    ///< the state folder or its database cannot be used
+  NotHereYet = 1,         ///< the request is known, and this version cannot answer it
+  MissingVolumeUUID = 2,  ///< the volume that holds the storage has no identity
+  NoDocumentsFolder = 3,  ///< no "Documents" component in the path: it has no trash
+  NotInTrash = 4,         ///< the item to be put back is not in the trash
+  UnknownBundle = 5,      ///< no application with that bundle identifier
+  NoValidParent = 6,      ///< nowhere to put an item back to
+  DamagedData = 7,        ///< an archive or a property list that cannot be decoded
+  InvalidArgument = 8,    ///< the caller's words are off; the message says how
+  StateUnavailable = 9,   ///< the state folder or its database cannot be used
 };
 
 /// What went wrong: a domain, a code of that domain, and what the reader may want to know more.

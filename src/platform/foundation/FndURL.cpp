@@ -50,8 +50,8 @@ std::string percentDecoded(std::string_view text) {
   for (std::size_t i = 0; i < text.size(); ++i) {
     const bool escape = text[i] == '%' && i + 2 < text.size() && hexValue(text[i + 1]) >= 0 &&
                         hexValue(text[i + 2]) >= 0;
-    bytes += escape ? static_cast<char>(hexValue(text[i + 1]) * 16 + hexValue(text[i + 2]))
-                    : text[i];
+    bytes +=
+        escape ? static_cast<char>(hexValue(text[i + 1]) * 16 + hexValue(text[i + 2])) : text[i];
     if (escape) i += 2;
   }
   return bytes;
@@ -84,14 +84,20 @@ struct FndURL::Object {
 };
 
 std::string_view resourceKeyName(FndURLResourceKey key) {
-  static constexpr std::array<std::string_view, 14> kNames = {
-      "FndURLParentDirectoryURLKey", "FndURLNameKey",
-      "FndURLLocalizedNameKey",      "FndURLTypeIdentifierKey",
-      "FndURLFileSizeKey",           "FndURLCreationDateKey",
-      "FndURLContentModificationDateKey", "FndURLIsReadableKey",
-      "FndURLIsWritableKey",         "FndURLIsDirectoryKey",
-      "FndURLIsPackageKey",          "FndURLFileResourceIdentifierKey",
-      "FndURLDocumentIdentifierKey", "FndURLContentVersionKey"};
+  static constexpr std::array<std::string_view, 14> kNames = {"FndURLParentDirectoryURLKey",
+                                                              "FndURLNameKey",
+                                                              "FndURLLocalizedNameKey",
+                                                              "FndURLTypeIdentifierKey",
+                                                              "FndURLFileSizeKey",
+                                                              "FndURLCreationDateKey",
+                                                              "FndURLContentModificationDateKey",
+                                                              "FndURLIsReadableKey",
+                                                              "FndURLIsWritableKey",
+                                                              "FndURLIsDirectoryKey",
+                                                              "FndURLIsPackageKey",
+                                                              "FndURLFileResourceIdentifierKey",
+                                                              "FndURLDocumentIdentifierKey",
+                                                              "FndURLContentVersionKey"};
   return kNames[static_cast<std::size_t>(key)];
 }
 

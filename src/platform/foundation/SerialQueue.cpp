@@ -193,8 +193,7 @@ void SerialQueue::asyncAfter(std::chrono::nanoseconds delay, Task task) const {
 }
 
 bool SerialQueue::isCurrent() const {
-  return std::find(currentQueues.begin(), currentQueues.end(), _state.get()) !=
-         currentQueues.end();
+  return std::find(currentQueues.begin(), currentQueues.end(), _state.get()) != currentQueues.end();
 }
 
 void SerialQueue::assertCurrent() const {

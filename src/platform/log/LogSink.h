@@ -28,9 +28,7 @@ class LogSink {
 
   /// The least level that is kept.
   LogLevel recordedLevel() const { return _recordedLevel.load(std::memory_order_relaxed); }
-  void setRecordedLevel(LogLevel level) {
-    _recordedLevel.store(level, std::memory_order_relaxed);
-  }
+  void setRecordedLevel(LogLevel level) { _recordedLevel.store(level, std::memory_order_relaxed); }
   bool records(LogLevel level) const { return level >= recordedLevel(); }
 
  private:

@@ -40,9 +40,9 @@ struct TremorEvent {
 
 /// What a stream is to read.
 struct TremorStreamRequest {
-  std::vector<std::string> paths;  ///< those below count too
-  std::optional<DeviceID> device;  ///< set: `paths` count from that device's root
-  EventID since;                   ///< the first event is the first one after this
+  std::vector<std::string> paths;        ///< those below count too
+  std::optional<DeviceID> device;        ///< set: `paths` count from that device's root
+  EventID since;                         ///< the first event is the first one after this
   std::chrono::milliseconds latency{0};  ///< how long the first event of a live batch may wait
   std::uint32_t flags = 0;
 };
