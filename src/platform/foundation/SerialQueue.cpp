@@ -73,6 +73,11 @@ class Pool {
     _timerWake.notify_one();
   }
 
+  void waitUntilQuiet() {
+    std::unique_lock lock(_mutex);
+    _quiet.wait(lock, [this] { return _ready.empty() && _idle == _threads; });
+  }
+
  private:
   static constexpr std::size_t kMostThreads = 64;
   static constexpr std::chrono::seconds kIdleTime{10};
@@ -92,6 +97,7 @@ class Pool {
     std::unique_lock lock(_mutex);
     for (;;) {
       ++_idle;
+      if (_ready.empty() && _idle == _threads) _quiet.notify_all();
       const bool found = _wake.wait_for(lock, kIdleTime, [this] { return !_ready.empty(); });
       --_idle;
       if (!found) break;
@@ -108,6 +114,7 @@ class Pool {
 
   std::mutex _mutex;
   std::condition_variable _wake;
+  std::condition_variable _quiet;
   std::deque<std::shared_ptr<State>> _ready;  // guarded by _mutex
   std::size_t _idle = 0;                      // guarded by _mutex
   std::size_t _threads = 0;                   // guarded by _mutex
@@ -221,5 +228,7 @@ SerialQueue::SyncTurn::~SyncTurn() {
   currentQueues.pop_back();
   passTurn(_state);
 }
+
+void waitForQuietQueues() { Pool::shared().waitUntilQuiet(); }
 
 }  // namespace vantrell

@@ -60,4 +60,9 @@ class SerialQueue {
   std::shared_ptr<State> _state;
 };
 
+/// Waits until no task of any queue runs or could run, for a program that is about to take away
+/// what tasks use. Tasks whose delay has not passed do not count. Called from within a task it
+/// would wait for itself.
+void waitForQuietQueues();
+
 }  // namespace vantrell
