@@ -45,8 +45,10 @@ class ArchiveValue {
   ArchiveValue() = default;  ///< null
   explicit ArchiveValue(FndNumber value) : _value(std::move(value)) {}
   explicit ArchiveValue(FndDate value) : _value(value) {}
-  explicit ArchiveValue(std::string value) : _value(std::move(value)) {}
-  explicit ArchiveValue(FndData value) : _value(std::move(value)) {}
+  explicit ArchiveValue(std::string value)
+      : _value(std::make_shared<const std::string>(std::move(value))) {}
+  explicit ArchiveValue(FndData value)
+      : _value(std::make_shared<const FndData>(std::move(value))) {}
   explicit ArchiveValue(List value) : _value(std::make_shared<const List>(std::move(value))) {}
   explicit ArchiveValue(Dictionary value)
       : _value(std::make_shared<const Dictionary>(std::move(value))) {}
@@ -59,8 +61,8 @@ class ArchiveValue {
   /// Null when the value is of another class. The value keeps what is pointed to.
   const FndNumber* number() const { return std::get_if<FndNumber>(&_value); }
   const FndDate* date() const { return std::get_if<FndDate>(&_value); }
-  const std::string* string() const { return std::get_if<std::string>(&_value); }
-  const FndData* data() const { return std::get_if<FndData>(&_value); }
+  const std::string* string() const { return pointee<std::string>(); }
+  const FndData* data() const { return pointee<FndData>(); }
   const List* list() const { return pointee<List>(); }
   const Dictionary* dictionary() const { return pointee<Dictionary>(); }
   const Record* record() const { return pointee<Record>(); }
@@ -78,9 +80,9 @@ class ArchiveValue {
     return shared == nullptr ? nullptr : shared->get();
   }
 
-  std::variant<std::monostate, FndNumber, FndDate, std::string, FndData,
-               std::shared_ptr<const List>, std::shared_ptr<const Dictionary>,
-               std::shared_ptr<const Record>>
+  std::variant<std::monostate, FndNumber, FndDate, std::shared_ptr<const std::string>,
+               std::shared_ptr<const FndData>, std::shared_ptr<const List>,
+               std::shared_ptr<const Dictionary>, std::shared_ptr<const Record>>
       _value;
 };
 

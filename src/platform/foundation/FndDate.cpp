@@ -114,7 +114,8 @@ std::optional<FndDate> FndDate::fromRFC3339(std::string_view text) {
 }
 
 double FndDate::secondsSinceReferenceDate() const {
-  return static_cast<double>(_seconds - kReferenceDate) +
+  // Subtracted as doubles: the integers could overflow, and both are exact in any real century.
+  return static_cast<double>(_seconds) - static_cast<double>(kReferenceDate) +
          static_cast<double>(_nanoseconds) / static_cast<double>(kNanosecondsPerSecond);
 }
 

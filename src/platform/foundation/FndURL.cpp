@@ -5,6 +5,8 @@
 #include <mutex>
 #include <utility>
 
+#include "platform/foundation/UnicodeText.h"
+
 namespace vantrell {
 namespace {
 
@@ -55,23 +57,6 @@ std::string percentDecoded(std::string_view text) {
     if (escape) i += 2;
   }
   return bytes;
-}
-
-// The length of the well-formed UTF-8 sequence at the front of `bytes`, 0 when there is none.
-std::size_t utf8SequenceLength(std::string_view bytes) {
-  const auto at = [&bytes](std::size_t i) { return static_cast<unsigned char>(bytes[i]); };
-  const unsigned char lead = at(0);
-  if (lead < 0x80) return 1;
-  const std::size_t length = lead >= 0xf0 ? 4 : lead >= 0xe0 ? 3 : 2;
-  if (lead < 0xc2 || lead > 0xf4 || bytes.size() < length) return 0;
-  for (std::size_t i = 1; i < length; ++i) {
-    if ((at(i) & 0xc0) != 0x80) return 0;
-  }
-  if (lead == 0xe0 && at(1) < 0xa0) return 0;  // overlong
-  if (lead == 0xed && at(1) > 0x9f) return 0;  // a surrogate
-  if (lead == 0xf0 && at(1) < 0x90) return 0;  // overlong
-  if (lead == 0xf4 && at(1) > 0x8f) return 0;  // beyond U+10FFFF
-  return length;
 }
 
 }  // namespace
