@@ -1,0 +1,174 @@
+#include <cerrno>
+#include <memory>
+#include <string>
+#include <utility>
+#include <variant>
+
+#include "applibraries/ZubAppLibraryManager.h"
+#include "identity/FndURL+ZubFileObjectIdentifier.h"
+#include "identity/ZubFileObjectIdentifier.h"
+#include "platform/Services.h"
+#include "platform/dochost/DhURLOperations.h"
+#include "platform/filesystem/URLResourceValues.h"
+#include "platform/foundation/Fatal.h"
+#include "platform/foundation/PosixNames.h"
+#include "support/Errors.h"
+#include "support/Log.h"
+
+namespace vantrell {
+namespace {
+
+// Lines of this layer carry no prefix for their level.
+template <class... Pieces>
+void log(LogLevel level, const Pieces&... pieces) {
+  logObject().write(level, pieces...);
+}
+
+// What `log` shows of an error that has an errno value.
+auto errnoText(const FndError& error) {
+  return [code = posixCodeOfError(error)] { return posixErrorDescription(code); };
+}
+
+std::string_view className(const FndURL::ResourceValue& value) {
+  static constexpr std::string_view kNames[] = {"FndString",  "FndNumber", "FndDate",
+                                                "FndBoolean", "FndData",   "FndURL"};
+  return kNames[value.index()];
+}
+
+// A number that one of the identifying resource keys gave.
+struct KnownNumber {
+  enum class State { Known, Absent, Failed } state;
+  std::uint64_t value = 0;
+};
+
+KnownNumber knownNumber(const FndURL& url, FndURLResourceKey key, std::string_view keyInMessages,
+                        std::string_view what) {
+  const auto value = resourceValue(url, key);
+  if (!value) {
+    log(isNoSuchFileReadError(value.error()) ? LogLevel::Debug : LogLevel::Error,
+        "can't get resource value for ", keyInMessages, "; ", value.error());
+    return {KnownNumber::State::Failed};
+  }
+  if (!*value) return {KnownNumber::State::Absent};
+  const FndNumber* number = std::get_if<FndNumber>(&**value);
+  const auto exact = number == nullptr ? std::nullopt : number->exactUInt64();
+  if (exact) return {KnownNumber::State::Known, *exact};
+  std::string message = "unexpected class for ";
+  message.append(what).append(" (expected: FndNumber, actual: ").append(className(**value));
+  developmentAssert(false, message + ")");
+  return {KnownNumber::State::Failed};
+}
+
+// True for a URL in the storage or in an app library. Fills `libraryRoot` when the URL is the
+// root folder of one.
+bool isPartOfVantrell(const FndURL& url, std::optional<FndURL>& libraryRoot) {
+  for (const FndURL& root : ZubAppLibraryManager::rootURLsForAppLibraries()) {
+    const DhURLRelationship relationship = dh_relationshipToItemAtURL(root, url);
+    if (relationship == DhURLRelationship::Same) libraryRoot = root;
+    if (relationship != DhURLRelationship::Other) return true;
+  }
+  return false;
+}
+
+DochostItemIdentifier identifierOfFolderLike(const FndURL& url, FileID fileID) {
+  url.setCachedResourceValue(FndURLResourceKey::FileResourceIdentifier, FndNumber(fileID.value));
+  return ZubFileObjectIdentifier::fromFileID(fileID);
+}
+
+std::optional<DochostItemIdentifier> identifierOfDocument(const FndURL& url, OpenFile& file,
+                                                          DocumentID documentID) {
+  if (documentID.value == 0) {
+    VerstowManager& verstow = *platform::services().verstow;
+    verstow.prepare();
+    documentID = verstow.getOrAllocateDocumentID(file).value_or(DocumentID{});
+  }
+  if (documentID.value == 0) {
+    log(LogLevel::Error, "can't get permanent storage for \"", url.path(), "\"");
+    return std::nullopt;
+  }
+  url.setCachedResourceValue(FndURLResourceKey::DocumentIdentifier,
+                             FndNumber(std::uint64_t{documentID.value}));
+  return ZubFileObjectIdentifier::fromDocumentID(documentID);
+}
+
+// Asks the object itself, for what no resource value has told.
+std::optional<DochostItemIdentifier> identifierFromFileSystem(const FndURL& url) {
+  const auto package = resourceValue(url, FndURLResourceKey::IsPackage);
+  if (!package) {
+    log(LogLevel::Error, "can't get resource FndURLIsPackageKey for \"", url.path(), "\"; ",
+        package.error());
+    return std::nullopt;
+  }
+  const bool* const packageFlag = *package ? std::get_if<bool>(&**package) : nullptr;
+  const bool isPackage = packageFlag != nullptr && *packageFlag;
+  const auto file = platform::services().fileSystem->open(url, OpenMode::EventOnly);
+  if (!file) {
+    log(LogLevel::Error, "can't open file at \"", url.path(), "\"; ", errnoText(file.error()));
+    return std::nullopt;
+  }
+  const Result<FileIdentity> identity = (*file)->identity();
+  if (!identity) {
+    log(LogLevel::Error, "can't get attribute list for \"", url.path(), "\"; ",
+        errnoText(identity.error()));
+    return std::nullopt;
+  }
+  const bool isDocument = identity->kind == FileKind::RegularFile ||
+                          (identity->kind == FileKind::Directory && isPackage);
+  if (!isDocument) return identifierOfFolderLike(url, identity->fileID);
+  return identifierOfDocument(url, **file, identity->documentID);
+}
+
+std::optional<DochostItemIdentifier> identifierInsideStorage(const FndURL& url) {
+  const bool isFolder = dh_isFolder(url);
+  const KnownNumber known = isFolder ? knownNumber(url, FndURLResourceKey::FileResourceIdentifier,
+                                                   "_kKorURLFileIDKey", "file ID")
+                                     : knownNumber(url, FndURLResourceKey::DocumentIdentifier,
+                                                   "FndURLDocumentIdentifierKey", "doc ID");
+  if (known.state == KnownNumber::State::Failed) return std::nullopt;
+  if (known.state == KnownNumber::State::Absent) return identifierFromFileSystem(url);
+  if (isFolder) return ZubFileObjectIdentifier::fromFileID(FileID{known.value});
+  const DocumentID documentID{static_cast<std::uint32_t>(known.value)};
+  if (documentID.value != known.value) return std::nullopt;  // no document has such a number
+  return ZubFileObjectIdentifier::fromDocumentID(documentID);
+}
+
+}  // namespace
+
+Result<DeviceID> deviceIDWithError(const FndURL& url) {
+  if (!url.isFileURL()) return std::unexpected(errorWithPOSIXCode(EINVAL));
+  const auto file = platform::services().fileSystem->open(url, OpenMode::EventOnly);
+  if (!file) return std::unexpected(errorWithPOSIXCode(posixCodeOfError(file.error())));
+  const Result<DeviceID> device = (*file)->deviceID();
+  if (!device) return std::unexpected(errorWithPOSIXCode(posixCodeOfError(device.error())));
+  if (device->value == 0) return std::unexpected(errorWithPOSIXCode(ENODEV));
+  return *device;
+}
+
+DeviceID deviceID(const FndURL& url) { return deviceIDWithError(url).value_or(DeviceID{}); }
+
+std::optional<DochostItemIdentifier> itemIdentifier(const FndURL& url) {
+  if (!url.isFileURL()) {
+    log(LogLevel::Error, "can't compute file object identifier if not a file URL");
+    return std::nullopt;
+  }
+  const FndURL& storageRoot = platform::services().manager->documentStorageURL();
+  switch (dh_relationshipToItemAtURL(storageRoot, url)) {
+    case DhURLRelationship::Same:
+      return DochostItemIdentifier(DochostRootContainerItemIdentifier);
+    case DhURLRelationship::Contains:
+      return identifierInsideStorage(url);
+    case DhURLRelationship::Other:
+      break;
+  }
+  std::optional<FndURL> libraryRoot;
+  if (!isPartOfVantrell(url, libraryRoot)) {
+    log(
+        LogLevel::Debug, "can't compute file object identifier because \"",
+        [&url] { return url.standardizedPath(); }, "\" is not part of Vantrell");
+    return std::nullopt;
+  }
+  if (libraryRoot) return ZubFileObjectIdentifier::fromAppLibraryDataContainerURL(*libraryRoot);
+  return identifierInsideStorage(url);
+}
+
+}  // namespace vantrell
