@@ -27,10 +27,13 @@ enum class ArchiveClass : std::uint8_t {
   Record
 };
 
-/// "FndNumber", "FndString", …: the class names as archives and messages spell them.
+/// "FndNumber", "FndArray", …: the class names as archives and messages spell them.
 std::string_view archiveClassName(ArchiveClass archiveClass);
 
-/// An object of a keyed archive: a tree of values.
+/// An object of a keyed archive: a tree of values. Strings, data and containers are shared by
+/// copies.
+///
+/// Threads: a value; what copies share is never written to.
 class ArchiveValue {
  public:
   using List = std::vector<ArchiveValue>;
@@ -87,7 +90,8 @@ class ArchiveValue {
 };
 
 /// The keyed archive of `root`, in its compact (binary property list) form. The same value gives
-/// the same bytes. Errors: as `binaryPropertyListFromValue`.
+/// the same bytes. Errors: as `binaryPropertyListFromValue`, and DamagedData for a record whose
+/// class name is one of `archiveClassName`.
 Result<FndData> archivedDataWithRootObject(const ArchiveValue& root);
 
 /// Decodes a keyed archive that anybody may have written, and only when every object in it is

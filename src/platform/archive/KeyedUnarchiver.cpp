@@ -12,8 +12,12 @@ namespace {
 using namespace keyedarchive;
 
 // How much more an archive may unfold to than it has bytes: in values, each counted wherever it
-// stands, and in bytes that are copied out of it. Our own never come near either.
+// stands, and in bytes that are copied out of it. In our own an element takes a byte at least, an
+// entry of a dictionary two and what is beyond 64 bytes of its key: they stay below it.
 constexpr std::uint64_t kUnfoldedPerByte = 64;
+
+// What an entry of a dictionary costs in memory beside its key, nearly.
+constexpr std::size_t kEntrySize = 2 * sizeof(ArchiveValue);
 
 std::unexpected<FndError> damaged(std::string_view what) {
   return std::unexpected(FndError::vantrell(VantrellErrorCode::DamagedData,
@@ -162,7 +166,7 @@ class Unarchiver {
     }
     const auto* elements = arrayField(fields, kElementsKey);
     if (elements == nullptr) return damagedObject("a list without its elements", index);
-    if (!copy(elements->size())) return unfoldsTooFar();
+    if (!copy(elements->size() * sizeof(ArchiveValue))) return unfoldsTooFar();
     ArchiveValue::List result;
     result.reserve(elements->size());
     for (const PropertyListValue& element : *elements) {
@@ -187,7 +191,7 @@ class Unarchiver {
     for (std::size_t i = 0; i < keys->size(); ++i) {
       const std::string* key = keyAt((*keys)[i]);
       if (key == nullptr) return damagedObject("a key that is no string", index);
-      if (!copy(key->size() + 1)) return unfoldsTooFar();
+      if (!copy(key->size() + kEntrySize)) return unfoldsTooFar();
       auto value = held((*elements)[i], index, depth, slot);
       if (!value) return value;
       if (!result.emplace(*key, std::move(*value)).second) {
@@ -212,7 +216,7 @@ class Unarchiver {
     ArchiveValue::Record result{name, {}};
     for (const auto& [key, object] : fields) {
       if (key == kClassKey) continue;
-      if (!copy(key.size() + 1)) return unfoldsTooFar();
+      if (!copy(key.size() + kEntrySize)) return unfoldsTooFar();
       auto value =
           object.uid() == nullptr ? plainField(object, slot) : held(object, 0, depth, slot);
       if (!value) return value;
