@@ -38,6 +38,8 @@ class FakeFaults {
  public:
   /// The next calls of that kind fail, one with each of `errors`.
   void failNext(FakeCall call, std::vector<FndError> errors);
+  /// The call after `count` more of that kind fails.
+  void failAfter(FakeCall call, std::size_t count, FndError error);
   /// Every call of that kind about `path` fails.
   void failAt(FakeCall call, std::string path, FndError error);
 
@@ -48,9 +50,10 @@ class FakeFaults {
 
  private:
   mutable std::mutex _mutex;
-  std::map<FakeCall, std::vector<FndError>> _next;           // guarded by _mutex
-  std::map<std::pair<FakeCall, std::string>, FndError> _at;  // guarded by _mutex
-  std::map<FakeCall, std::size_t> _calls;                    // guarded by _mutex
+  std::map<std::pair<FakeCall, std::size_t>, FndError> _atCount;  // guarded by _mutex
+  std::map<FakeCall, std::vector<FndError>> _next;                // guarded by _mutex
+  std::map<std::pair<FakeCall, std::string>, FndError> _at;       // guarded by _mutex
+  std::map<FakeCall, std::size_t> _calls;                         // guarded by _mutex
 };
 
 }  // namespace vantrell
