@@ -5,24 +5,12 @@
 
 #include <ctime>
 
-#include "fakes/FakeItem.h"
 #include "platform/dochost/DochostTags.h"
+#include "tests/fakes/FakeItem.h"
+#include "tests/fakes/FakeTypeRegistry.h"
 
 namespace vantrell::cli {
 namespace {
-
-// Knows what the table asks for: which types are packages.
-class PackageTypes : public TypeRegistry {
- public:
-  std::string typeIdentifierForName(std::string_view, FileKind) const override {
-    return std::string(kDataTypeIdentifier);
-  }
-  bool typeConformsTo(std::string_view type, std::string_view supertype) const override {
-    return type == supertype ||
-           (supertype == kPackageTypeIdentifier && type.starts_with("com.quillon."));
-  }
-  std::string descriptionOfType(std::string_view type) const override { return std::string(type); }
-};
 
 class ItemTableTest : public testing::Test {
  protected:
@@ -42,7 +30,7 @@ class ItemTableTest : public testing::Test {
     return result;
   }
 
-  PackageTypes _types;
+  FakeTypeRegistry _types;
 };
 
 TEST_F(ItemTableTest, ColumnsAreAligned) {

@@ -4,8 +4,8 @@
 
 #include <cerrno>
 
-#include "fakes/FakeItem.h"
 #include "platform/dochost/DochostTags.h"
+#include "tests/fakes/FakeItem.h"
 
 namespace vantrell::cli {
 namespace {
