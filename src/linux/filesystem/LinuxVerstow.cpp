@@ -26,7 +26,7 @@ Result<void> LinuxVerstow::checkDevice(DeviceID device, int osError) const {
 }
 
 Result<FileID> LinuxVerstow::resolveDocumentID(DocumentID documentID, DeviceID device) {
-  if (auto checked = checkDevice(device, ENODEV); !checked) {
+  if (auto checked = checkDevice(device, ENOENT); !checked) {
     return std::unexpected(std::move(checked.error()));
   }
   return _index.fileIDOfDocument(documentID);
