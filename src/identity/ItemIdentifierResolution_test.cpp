@@ -3,6 +3,7 @@
 #include <cerrno>
 #include <chrono>
 
+#include "applibraries/ZubAppLibraryManager.h"
 #include "identity/FndURL+ZubFileObjectIdentifier.h"
 #include "platform/foundation/PosixNames.h"
 #include "tests/fakes/TestSystem.h"
@@ -14,6 +15,7 @@ class ResolutionTest : public testing::Test {
  protected:
   // The identifier leads nowhere, and exactly these lines say why.
   void expectNone(std::string_view identifier, LogLevel level, std::vector<std::string> lines) {
+    ZubAppLibraryManager::rootURLsForAppLibraries();  // so that finding them is not in the way
     system.log.clear();
     EXPECT_EQ(fileURLWithItemIdentifier(identifier), std::nullopt) << identifier;
     EXPECT_EQ(system.log.textsAt(level), lines) << identifier;
