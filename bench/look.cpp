@@ -16,11 +16,13 @@ int main(int argc, char** argv) {
     std::fputs("usage: look STORAGE STATE-FOLDER\n", stderr);
     return 2;
   }
+  linuxos::LinuxSystemOptions options;
+  options.storageRoot = argv[1];
+  options.stateFolder = argv[2];
+  options.dataFolders = linuxos::XdgFolders::ofThisProcess().dataFolders();
+
   const auto start = bench::Clock::now();
-  auto system = linuxos::LinuxSystem::open(
-      {.storageRoot = argv[1],
-       .stateFolder = argv[2],
-       .dataFolders = linuxos::XdgFolders::ofThisProcess().dataFolders()});
+  auto system = linuxos::LinuxSystem::open(options);
   if (!system) return bench::failed(system.error());
   const auto look = (*system)->look();
   if (!look) return bench::failed(look.error());
