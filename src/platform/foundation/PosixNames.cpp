@@ -5,77 +5,39 @@
 
 namespace vantrell {
 
+namespace {
+
+struct PosixName {
+  int osError;
+  std::string_view name;
+};
+
+constexpr PosixName kPosixNames[] = {
+    {E2BIG, "E2BIG"},     {EACCES, "EACCES"},
+    {EAGAIN, "EAGAIN"},   {EBADF, "EBADF"},
+    {EBUSY, "EBUSY"},     {EEXIST, "EEXIST"},
+    {EFBIG, "EFBIG"},     {EINTR, "EINTR"},
+    {EINVAL, "EINVAL"},   {EIO, "EIO"},
+    {EISDIR, "EISDIR"},   {ELOOP, "ELOOP"},
+    {EMFILE, "EMFILE"},   {ENAMETOOLONG, "ENAMETOOLONG"},
+    {ENFILE, "ENFILE"},   {ENODATA, "ENODATA"},
+    {ENODEV, "ENODEV"},   {ENOENT, "ENOENT"},
+    {ENOMEM, "ENOMEM"},   {ENOSPC, "ENOSPC"},
+    {ENOTDIR, "ENOTDIR"}, {ENOTEMPTY, "ENOTEMPTY"},
+    {ENOTSUP, "ENOTSUP"}, {ENXIO, "ENXIO"},
+    {EPERM, "EPERM"},     {ERANGE, "ERANGE"},
+    {EROFS, "EROFS"},     {ETXTBSY, "ETXTBSY"},
+    {EXDEV, "EXDEV"},     {EDQUOT, "EDQUOT"},
+    {ESTALE, "ESTALE"},
+};
+
+}  // namespace
+
 std::string_view posixErrorName(int osError) {
-  switch (osError) {
-    case E2BIG:
-      return "E2BIG";
-    case EACCES:
-      return "EACCES";
-    case EAGAIN:
-      return "EAGAIN";
-    case EBADF:
-      return "EBADF";
-    case EBUSY:
-      return "EBUSY";
-    case EEXIST:
-      return "EEXIST";
-    case EFBIG:
-      return "EFBIG";
-    case EINTR:
-      return "EINTR";
-    case EINVAL:
-      return "EINVAL";
-    case EIO:
-      return "EIO";
-    case EISDIR:
-      return "EISDIR";
-    case ELOOP:
-      return "ELOOP";
-    case EMFILE:
-      return "EMFILE";
-    case ENAMETOOLONG:
-      return "ENAMETOOLONG";
-    case ENFILE:
-      return "ENFILE";
-    case ENODATA:
-      return "ENODATA";
-    case ENODEV:
-      return "ENODEV";
-    case ENOENT:
-      return "ENOENT";
-    case ENOMEM:
-      return "ENOMEM";
-    case ENOSPC:
-      return "ENOSPC";
-    case ENOTDIR:
-      return "ENOTDIR";
-    case ENOTEMPTY:
-      return "ENOTEMPTY";
-    case ENOTSUP:
-      return "ENOTSUP";
-    case ENXIO:
-      return "ENXIO";
-    case EPERM:
-      return "EPERM";
-    case ERANGE:
-      return "ERANGE";
-    case EROFS:
-      return "EROFS";
-    case ETXTBSY:
-      return "ETXTBSY";
-    case EXDEV:
-      return "EXDEV";
-#ifdef EDQUOT
-    case EDQUOT:
-      return "EDQUOT";
-#endif
-#ifdef ESTALE
-    case ESTALE:
-      return "ESTALE";
-#endif
-    default:
-      return {};
+  for (const PosixName& known : kPosixNames) {
+    if (known.osError == osError) return known.name;
   }
+  return {};
 }
 
 std::string posixErrorText(int osError) { return std::generic_category().message(osError); }
