@@ -4,7 +4,6 @@
 #include <system_error>
 
 namespace vantrell {
-
 namespace {
 
 struct PosixName {
@@ -27,8 +26,13 @@ constexpr PosixName kPosixNames[] = {
     {ENOTSUP, "ENOTSUP"}, {ENXIO, "ENXIO"},
     {EPERM, "EPERM"},     {ERANGE, "ERANGE"},
     {EROFS, "EROFS"},     {ETXTBSY, "ETXTBSY"},
-    {EXDEV, "EXDEV"},     {EDQUOT, "EDQUOT"},
+    {EXDEV, "EXDEV"},
+#ifdef EDQUOT
+    {EDQUOT, "EDQUOT"},
+#endif
+#ifdef ESTALE
     {ESTALE, "ESTALE"},
+#endif
 };
 
 }  // namespace
