@@ -1,6 +1,7 @@
 #include "tests/fakes/FakeLogSink.h"
 
 #include <algorithm>
+#include <chrono>
 
 namespace vantrell {
 
@@ -8,6 +9,15 @@ void FakeLogSink::write(const LogLine& line) {
   const std::lock_guard lock(_mutex);
   _lines.push_back({line.level, std::string(line.subsystem), std::string(line.category),
                     std::string(line.text)});
+  _grown.notify_all();
+}
+
+bool FakeLogSink::waitForLineEndingWith(std::string_view end) {
+  std::unique_lock lock(_mutex);
+  return _grown.wait_for(lock, std::chrono::seconds(30), [this, end] {
+    return std::ranges::any_of(_lines,
+                               [end](const FakeLogLine& line) { return line.text.ends_with(end); });
+  });
 }
 
 std::vector<FakeLogLine> FakeLogSink::lines() const {

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <condition_variable>
 #include <mutex>
 #include <string>
 #include <vector>
@@ -32,8 +33,12 @@ class FakeLogSink : public LogSink {
   bool has(LogLevel level, std::string_view text) const;
   void clear();
 
+  /// Waits until a line ends with `end`; false when none has come in half a minute.
+  bool waitForLineEndingWith(std::string_view end);
+
  private:
   mutable std::mutex _mutex;
+  std::condition_variable _grown;
   std::vector<FakeLogLine> _lines;  // guarded by _mutex
 };
 
