@@ -32,7 +32,11 @@ constexpr const char* kNumbersName = "/document-ids";
 
 Result<void> makeStateFolder(const std::string& folder) {
   std::error_code failure;
-  std::filesystem::create_directories(folder, failure);
+  const bool isNew = std::filesystem::create_directories(folder, failure);
+  // It holds the names of all documents, which are nobody else's business.
+  if (isNew && !failure) {
+    std::filesystem::permissions(folder, std::filesystem::perms::owner_all, failure);
+  }
   if (!failure) return {};
   return std::unexpected(catalog::stateUnavailable(
       "can't make the state folder \"" + folder + "\": " + failure.message() +
@@ -55,9 +59,9 @@ class Catalog::State {
 
   ~State() {
     // Whoever saw damage leaves the check to the next start.
-    if (_store && !_store->database->sawDamage()) {
-      static_cast<void>(_store->state.noteCleanStop());
-    }
+    if (!_store || _store->database->sawDamage()) return;
+    const auto stopped = stopCleanly();
+    if (!stopped) report("can't close the catalog in good order", stopped.error());
   }
 
   Result<void> openStore() {
@@ -96,6 +100,14 @@ class Catalog::State {
   std::string databasePath() const { return _options.stateFolder + kDatabaseName; }
   std::string storageRoot() const {
     return _options.roots.empty() ? std::string() : _options.roots.front();
+  }
+
+  Result<void> stopCleanly() {
+    auto transaction = catalog::Transaction::begin(*_store->database);
+    if (!transaction) return std::unexpected(transaction.error());
+    if (auto released = _store->numbers.release(); !released) return released;
+    if (auto noted = _store->state.noteCleanStop(); !noted) return noted;
+    return transaction->commit();
   }
 
   void closeStore() {

@@ -42,6 +42,9 @@ CatalogTest::CatalogTest() {
 
 CatalogTest::~CatalogTest() {
   _catalog.reset();
+  if (_wasRoot) {
+    EXPECT_EQ(::seteuid(0), 0);
+  }
   std::error_code ignored;
   fs::remove_all(_folder, ignored);
 }
@@ -96,6 +99,17 @@ std::string CatalogTest::attribute(std::string_view name, const char* attribute)
   std::array<char, 256> value{};
   const ssize_t size = ::lgetxattr(path(name).c_str(), attribute, value.data(), value.size());
   return size < 0 ? std::string("none") : std::string(value.data(), static_cast<size_t>(size));
+}
+
+void CatalogTest::becomeOrdinaryUser() {
+  if (::geteuid() != 0) return;
+  constexpr uid_t kNobody = 65534;
+  ASSERT_EQ(::chown(_folder.c_str(), kNobody, kNobody), 0);
+  for (const auto& entry : fs::recursive_directory_iterator(_folder)) {
+    ASSERT_EQ(::lchown(entry.path().c_str(), kNobody, kNobody), 0);
+  }
+  ASSERT_EQ(::seteuid(kNobody), 0);
+  _wasRoot = true;
 }
 
 void CatalogTest::letTimePass() const {

@@ -42,6 +42,9 @@ class CatalogTest : public testing::Test {
   void setAttribute(std::string_view name, const char* attribute, std::string_view value);
   std::string attribute(std::string_view name, const char* attribute) const;
 
+  /// From now on root's right to do everything is gone; files made so far belong to the user.
+  void becomeOrdinaryUser();
+
   /// Waits until nothing that was done so far counts as recent, so that the next look trusts it.
   void letTimePass() const;
 
@@ -72,6 +75,7 @@ class CatalogTest : public testing::Test {
   TesseraTypes _types;
   std::vector<std::pair<LogLevel, std::string>> _lines;
   std::unique_ptr<Catalog> _catalog;
+  bool _wasRoot = false;
 };
 
 }  // namespace vantrell::linuxos

@@ -28,7 +28,7 @@ Result<void> DocumentLookup::load(FileID folder) {
   const auto version = _store.dataVersion();
   if (!version) return std::unexpected(version.error());
   if (_known && _known->fileID() == folder && *version == _dataVersion) return {};
-  auto known = KnownFolder::read(_store.entries, _store.documents, folder);
+  auto known = _reader.read(folder);
   if (!known) return std::unexpected(known.error());
   _known = std::move(*known);
   _dataVersion = *version;

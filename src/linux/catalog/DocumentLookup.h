@@ -19,7 +19,8 @@ namespace vantrell::linuxos::catalog {
 /// Threads: as the store. Lifetime: borrows the store and the view.
 class DocumentLookup {
  public:
-  DocumentLookup(Store& store, const View& view) : _store(store), _view(view) {}
+  DocumentLookup(Store& store, const View& view)
+      : _store(store), _view(view), _reader(*store.database) {}
 
   /// The IDs in order; 0 for an object that is gone by now or lies on another volume.
   Result<std::vector<DocumentID>> idsOf(FileID folder, std::span<const SeenObject> objects);
@@ -54,6 +55,7 @@ class DocumentLookup {
 
   Store& _store;
   const View& _view;
+  KnownFolderReader _reader;
   std::optional<KnownFolder> _known;  // of the folder asked about last
   std::int64_t _dataVersion = -1;     // changes when another process has written
 };

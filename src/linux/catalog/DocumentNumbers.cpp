@@ -55,30 +55,44 @@ DocumentNumbers::DocumentNumbers(Database& database, std::string file, std::stri
       _write(database, "UPDATE state SET nextDocumentID = ?1, reservedDocumentID = ?2") {}
 
 Result<DocumentID> DocumentNumbers::next() {
-  const auto row = _read.with().step();
-  if (!row) return std::unexpected(row.error());
-  const std::uint64_t stored = _read.bits(0);
-  std::uint64_t reserved = _read.bits(1);
-  _read.reset();
-  const auto number = firstFree(stored, reserved);
-  if (!number) return std::unexpected(number.error());
-  if (*number >= kEnd) return std::unexpected(posixError(EOVERFLOW));
-  if (*number >= reserved) {
-    reserved = std::min(*number + kBlock, kEnd);
-    if (auto done = reserve(reserved); !done) return std::unexpected(done.error());
+  auto stored = read();
+  if (!stored) return std::unexpected(stored.error());
+  const std::uint64_t number = firstFree(*stored);
+  if (number >= kEnd) return std::unexpected(posixError(EOVERFLOW));
+  if (number >= stored->reserved) {
+    stored->reserved = std::min(number + kBlock, kEnd);
+    if (auto done = reserve(stored->reserved); !done) return std::unexpected(done.error());
   }
-  if (auto done = _write.with(*number + 1, reserved).run(); !done) {
+  _isUsed = true;
+  if (auto done = _write.with(number + 1, stored->reserved).run(); !done) {
     return std::unexpected(done.error());
   }
-  return DocumentID{static_cast<std::uint32_t>(*number)};
+  return DocumentID{static_cast<std::uint32_t>(number)};
 }
 
-Result<std::uint64_t> DocumentNumbers::firstFree(std::uint64_t next, std::uint64_t reserved) {
-  if (_isChecked && next < reserved) return next;
-  // More is reserved than the database knows of: it was lost, or it is older than what was told.
+// A database from a backup may know of the same block and of fewer numbers used in it. So every
+// process begins behind what is reserved, and who stops in good order leaves nothing reserved.
+std::uint64_t DocumentNumbers::firstFree(const Stored& stored) const {
+  if (_isUsed && stored.next < stored.reserved) return stored.next;
   const std::uint64_t elsewhere = std::max(readFile(), readAttribute());
-  _isChecked = true;
-  return std::max({next, elsewhere > reserved ? elsewhere : 0, secondsSince2024()});
+  const std::uint64_t known = _isUsed ? stored.next : std::max(stored.next, stored.reserved);
+  return std::max({known, elsewhere > stored.reserved ? elsewhere : 0, secondsSince2024()});
+}
+
+Result<void> DocumentNumbers::release() {
+  if (!_isUsed) return {};
+  const auto stored = read();
+  if (!stored) return std::unexpected(stored.error());
+  if (auto done = reserve(stored->next); !done) return done;
+  return _write.with(stored->next, stored->next).run();
+}
+
+Result<DocumentNumbers::Stored> DocumentNumbers::read() {
+  const auto row = _read.with().step();
+  if (!row) return std::unexpected(row.error());
+  const Stored stored{_read.bits(0), _read.bits(1)};
+  _read.reset();
+  return stored;
 }
 
 Result<void> DocumentNumbers::reserve(std::uint64_t end) {

@@ -28,8 +28,18 @@ class DocumentNumbers {
   /// 32-bit numbers are used up; POSIX.
   Result<DocumentID> next();
 
+  /// Gives back what is reserved and was not used; call it within a transaction, as the last
+  /// thing. Errors: POSIX; some numbers are then never used.
+  Result<void> release();
+
  private:
-  Result<std::uint64_t> firstFree(std::uint64_t next, std::uint64_t reserved);
+  struct Stored {
+    std::uint64_t next = 0;
+    std::uint64_t reserved = 0;  // the first one that is not
+  };
+
+  Result<Stored> read();
+  std::uint64_t firstFree(const Stored& stored) const;
   Result<void> reserve(std::uint64_t end);
   Result<void> writeFile(std::uint64_t end) const;
   void writeAttribute(std::uint64_t end) const;
@@ -39,7 +49,7 @@ class DocumentNumbers {
   std::string _file;
   std::string _storageRoot;
   LogLine _log;
-  bool _isChecked = false;  // the reservations outside the database have been looked at
+  bool _isUsed = false;  // this process has taken a number
   Statement _read;
   Statement _write;
 };

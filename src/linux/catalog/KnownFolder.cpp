@@ -9,44 +9,45 @@ namespace {
 
 // 48 bytes each.
 constexpr std::uint64_t kMostEntries = 16'384;
-constexpr std::size_t kPage = 4096;
 
 }  // namespace
 
-Result<std::optional<KnownFolder>> KnownFolder::read(EntryTable& entries, DocumentTable& documents,
-                                                     FileID folder) {
-  const auto record = entries.folder(folder);
-  if (!record) return std::unexpected(record.error());
-  if (!*record || (*record)->entryCount > kMostEntries) return std::nullopt;
-  const auto known = documents.documentsOfFolder(folder);
-  if (!known) return std::unexpected(known.error());
-  KnownFolder result(folder);
-  if (auto read = result.readEntries(entries, *known); !read) {
-    return std::unexpected(read.error());
-  }
-  return result;
+Result<std::optional<KnownFolder>> KnownFolderReader::read(FileID folder) {
+  const auto row = _count.with(folder).step();
+  if (!row) return std::unexpected(row.error());
+  const bool isWanted = *row && _count.bits(0) <= kMostEntries;
+  _count.reset();
+  if (!isWanted) return std::nullopt;
+  KnownFolder known(folder);
+  const auto read = readEntries(known);
+  _entries.reset();
+  _documents.reset();
+  if (!read) return std::unexpected(read.error());
+  std::ranges::sort(known._entries, {},
+                    [](const KnownEntry& entry) { return entry.object.fileID; });
+  return known;
 }
 
-// Both come by name, so that one pass over both brings them together.
-Result<void> KnownFolder::readEntries(EntryTable& entries, const std::vector<Document>& documents) {
-  auto document = documents.begin();
-  std::string after;
-  for (bool isLast = false; !isLast;) {
-    const auto page = entries.entriesOfFolder(_fileID, after, kPage);
-    if (!page) return std::unexpected(page.error());
-    isLast = page->size() < kPage;
-    for (const Entry& entry : *page) {
-      while (document != documents.end() && document->home.name < entry.name) ++document;
-      const bool isHome = document != documents.end() && document->home.name == entry.name &&
-                          document->object == entry.object();
-      if (!entry.kind.isDocument() || entry.kind.isRecent()) continue;
-      _entries.push_back({std::hash<std::string_view>()(entry.name), entry.object(),
-                          entry.changedNanoseconds, isHome ? document->documentID : DocumentID{}});
-    }
-    if (!page->empty()) after = page->back().name;
+// Both come by name, so that one pass over both brings them together. A living document stands
+// for the object that is catalogued at its home; every look sees to that.
+Result<void> KnownFolderReader::readEntries(KnownFolder& folder) {
+  auto document = _documents.with(folder.fileID()).step();
+  for (_entries.with(folder.fileID());;) {
+    const auto row = _entries.step();
+    if (!row) return std::unexpected(row.error());
+    if (!*row) return {};
+    const std::string_view name = _entries.bytes(0);
+    while (document && *document && _documents.bytes(0) < name) document = _documents.step();
+    if (!document) return std::unexpected(document.error());
+    const FileID fileID = _entries.fileID(1);
+    const bool isHome = *document && _documents.bytes(0) == name && _documents.fileID(1) == fileID;
+    const EntryKind kind{static_cast<std::uint32_t>(_entries.integer(3))};
+    if (!kind.isDocument() || kind.isRecent()) continue;
+    folder._entries.push_back({std::hash<std::string_view>()(name),
+                               {fileID, _entries.bits(2)},
+                               _entries.integer(4),
+                               isHome ? _documents.documentID(2) : DocumentID{}});
   }
-  std::ranges::sort(_entries, {}, [](const KnownEntry& entry) { return entry.object.fileID; });
-  return {};
 }
 
 const KnownEntry* KnownFolder::find(std::string_view name, FileID fileID,

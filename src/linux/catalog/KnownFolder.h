@@ -5,9 +5,10 @@
 #include <string_view>
 #include <vector>
 
-#include "linux/catalog/DocumentTable.h"
-#include "linux/catalog/EntryTable.h"
+#include "linux/catalog/Comparison.h"
+#include "linux/catalog/Database.h"
 #include "platform/foundation/FndError.h"
+#include "platform/foundation/Identifiers.h"
 
 namespace vantrell::linuxos::catalog {
 
@@ -25,10 +26,6 @@ struct KnownEntry {
 /// Threads: as its database.
 class KnownFolder {
  public:
-  /// Reads the folder; none when it holds too much to be kept in memory.
-  static Result<std::optional<KnownFolder>> read(EntryTable& entries, DocumentTable& documents,
-                                                 FileID folder);
-
   FileID fileID() const { return _fileID; }
   /// The entry of that name when the number and the ctime prove that the same object stands
   /// there; else null.
@@ -36,11 +33,35 @@ class KnownFolder {
                          std::int64_t changedNanoseconds) const;
 
  private:
+  friend class KnownFolderReader;
   explicit KnownFolder(FileID fileID) : _fileID(fileID) {}
-  Result<void> readEntries(EntryTable& entries, const std::vector<Document>& documents);
 
   FileID _fileID;
   std::vector<KnownEntry> _entries;  // by file ID
+};
+
+/// Reads folders into memory, in one pass over their entries and documents.
+///
+/// Errors: POSIX, the database's.
+/// Threads: as its database. Lifetime: borrows the database.
+class KnownFolderReader {
+ public:
+  explicit KnownFolderReader(Database& database) : _database(database) {}
+
+  /// None for a folder that is not catalogued, or that holds too much to be kept in memory.
+  Result<std::optional<KnownFolder>> read(FileID folder);
+
+ private:
+  Result<void> readEntries(KnownFolder& folder);
+
+  Database& _database;
+  Statement _count{_database, "SELECT entryCount FROM folders WHERE fileID = ?1"};
+  Statement _entries{_database,
+                     "SELECT name, fileID, generation, kind, ctime FROM entries "
+                     "WHERE parent = ?1 ORDER BY name"};
+  Statement _documents{_database,
+                       "SELECT homeName, fileID, documentID FROM documents "
+                       "WHERE homeParent = ?1 AND isAlive = 1 ORDER BY homeName"};
 };
 
 }  // namespace vantrell::linuxos::catalog

@@ -20,14 +20,14 @@ Result<std::string> PathLookup::pathForFileID(FileID fileID) {
   return std::move(**path);
 }
 
-bool PathLookup::isThere(const std::string& path, FileID fileID) const {
+bool PathLookup::stands(const std::string& path, const ObjectID& object) const {
   const auto found = objectStandingAt(path);
-  return found && found->entry.fileID == fileID && found->device == _view.device;
+  return found && found->entry.object() == object && found->device == _view.device;
 }
 
 Result<std::optional<std::string>> PathLookup::cataloguedPath(FileID fileID) {
   for (const RootRecord& root : _view.roots) {
-    if (root.object.fileID == fileID && isThere(root.path, fileID)) return root.path;
+    if (root.object.fileID == fileID && stands(root.path, root.object)) return root.path;
   }
   const auto places = _store.entries.placesOfFileID(fileID);
   if (!places) return std::unexpected(places.error());
@@ -36,7 +36,7 @@ Result<std::optional<std::string>> PathLookup::cataloguedPath(FileID fileID) {
     if (!path) return path;
     // With another generation the number is another object's by now, and there may be more that
     // the catalog does not know yet.
-    if (*path && isThere(**path, fileID) && standsAt(**path, place.entry.object())) return path;
+    if (*path && stands(**path, place.entry.object())) return path;
   }
   return std::nullopt;
 }
@@ -44,7 +44,7 @@ Result<std::optional<std::string>> PathLookup::cataloguedPath(FileID fileID) {
 Result<std::optional<std::string>> PathLookup::seenPath(FileID fileID) {
   auto seen = _store.seen.place(fileID);
   if (!seen) return std::unexpected(seen.error());
-  if (!*seen || !standsAt((*seen)->path, {fileID, (*seen)->generation})) return std::nullopt;
+  if (!*seen || !stands((*seen)->path, {fileID, (*seen)->generation})) return std::nullopt;
   return std::move((*seen)->path);
 }
 
@@ -68,10 +68,10 @@ Result<FileID> PathLookup::fileIDOfDocument(DocumentID documentID) {
 Result<bool> PathLookup::isAtHome(const Document& document) {
   if (!document.isAlive) return false;
   const Home& home = document.home;
-  if (home.isOutOfView()) return standsAt(home.name, document.object);
+  if (home.isOutOfView()) return stands(home.name, document.object);
   const auto path = pathOf(_store.entries, _view.roots, home.parent, home.name);
   if (!path) return std::unexpected(path.error());
-  return *path && standsAt(**path, document.object);
+  return *path && stands(**path, document.object);
 }
 
 Result<void> PathLookup::noteSeen(const SeenObject& object) {

@@ -30,7 +30,7 @@ class PathLookup {
   Result<std::optional<std::string>> cataloguedPath(FileID fileID);
   Result<std::optional<std::string>> seenPath(FileID fileID);
   Result<bool> isAtHome(const Document& document);
-  bool isThere(const std::string& path, FileID fileID) const;
+  bool stands(const std::string& path, const ObjectID& object) const;
 
   Store& _store;
   const View& _view;

@@ -182,6 +182,13 @@ bool isDamage(const Database& database, const FndError& error) {
 
 /// None when the file is damaged.
 Result<std::optional<OpenedDatabase>> tryOpen(const std::string& path, bool isNew) {
+  // SQLite would let everybody read the file; what it makes beside it has the same mode.
+  if (isNew) {
+    const FileDescriptor made(
+        ::open(path.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600));
+    const int osError = errno;
+    if (!made) return std::unexpected(unusableError(path, posixError(osError)));
+  }
   auto database = Database::open(path);
   if (!database) return std::unexpected(unusableError(path, database.error()));
   auto ready = prepareTables(**database, isNew);
