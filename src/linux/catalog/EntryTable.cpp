@@ -44,6 +44,14 @@ Result<std::vector<Entry>> EntryTable::subfolders(FileID parent, std::string_vie
   return read(_subfolders.with(parent, after, std::uint64_t{limit}));
 }
 
+Result<std::uint64_t> EntryTable::countOfFolder(FileID parent) {
+  const auto row = _count.with(parent).step();
+  if (!row) return std::unexpected(row.error());
+  const std::uint64_t count = _count.bits(0);
+  _count.reset();
+  return count;
+}
+
 Result<std::optional<Entry>> EntryTable::entry(FileID parent, std::string_view name) {
   auto found = read(_entry.with(parent, name));
   if (!found) return std::unexpected(found.error());

@@ -48,6 +48,7 @@ class EntryTable {
                                              std::size_t limit);
   /// As `entriesOfFolder`, for directories alone.
   Result<std::vector<Entry>> subfolders(FileID parent, std::string_view after, std::size_t limit);
+  Result<std::uint64_t> countOfFolder(FileID parent);
   Result<std::optional<Entry>> entry(FileID parent, std::string_view name);
   /// Every place where an object of that number is catalogued.
   Result<std::vector<PlacedEntry>> placesOfFileID(FileID fileID);
@@ -76,6 +77,7 @@ class EntryTable {
   Statement _entry{_database,
                    "SELECT name, fileID, generation, kind, size, mtime, ctime FROM entries "
                    "WHERE parent = ?1 AND name = ?2"};
+  Statement _count{_database, "SELECT count(*) FROM entries WHERE parent = ?1"};
   Statement _places{_database,
                     "SELECT name, fileID, generation, kind, size, mtime, ctime, parent "
                     "FROM entries WHERE fileID = ?1 ORDER BY parent, name"};

@@ -60,14 +60,18 @@ Result<FolderOutcome> FolderLook::compareWhole(std::vector<Entry>& seen) {
 }
 
 Result<FolderOutcome> FolderLook::compareInPieces(std::vector<Entry> piece) {
+  FolderOutcome outcome;
   while (!piece.empty()) {
+    outcome.entryCount += piece.size();
     if (auto compared = comparePiece(piece); !compared) return std::unexpected(compared.error());
     auto next = _reader.next(kPiece);
     if (!next) return FolderOutcome{next.error()};
     piece = std::move(*next);
   }
   // Which catalogued names were not among the pieces is not remembered; the disk knows.
-  return askForEachCatalogued();
+  const auto catalogued = _entries.countOfFolder(_folder.fileID);
+  if (!catalogued) return std::unexpected(catalogued.error());
+  return *catalogued == outcome.entryCount ? outcome : askForEachCatalogued();
 }
 
 Result<void> FolderLook::comparePiece(std::vector<Entry>& piece) {

@@ -146,7 +146,7 @@ Result<void> Look::applyOne(const FolderInHand& folder, const Difference& differ
                                         : _store.entries.remove(folder.fileID, name);
   if (!written) return written;
   if (_isFirst) {
-    ++_report.created;
+    if (difference.kind == DifferenceKind::Appeared) ++_report.created;
     return {};
   }
   if (difference.kind == DifferenceKind::Changed) ++_report.changed;
