@@ -20,10 +20,11 @@ MountAccess mountAccessOf(int folder) {
   return (volume.f_flag & ST_RDONLY) != 0 ? MountAccess::ReadOnly : MountAccess::ReadWrite;
 }
 
-ObjectAccess accessTo(int folder, const char* name, const ObjectStatus& status, MountAccess mount) {
+ObjectAccess accessTo(int folder, const char* name, const ObjectStatus& status, MountAccess mount,
+                      uid_t user) {
   // An owner's bits are the whole answer when they grant: no access list overrides them. Groups,
   // lists and privileges are the kernel's to weigh, at the price of a call.
-  const bool owns = status.owner == ::geteuid();
+  const bool owns = status.owner == user;
   const bool settledForWriting = mount == MountAccess::ReadWrite && !status.isMountPoint &&
                                  !status.isImmutable && (status.permissions & S_IWUSR) != 0;
   return {

@@ -16,8 +16,9 @@ struct ObjectAccess {
   bool writable = false;
 };
 
-/// The effective user's access to `name` in `folder`, as the kernel would grant it. `mount` is
-/// that of the folder; with `Unknown` the kernel is asked.
-ObjectAccess accessTo(int folder, const char* name, const ObjectStatus& status, MountAccess mount);
+/// The access of `user`, who is the effective one, to `name` in `folder`, as the kernel would
+/// grant it. `mount` is that of the folder; with `Unknown` the kernel is asked.
+ObjectAccess accessTo(int folder, const char* name, const ObjectStatus& status, MountAccess mount,
+                      uid_t user);
 
 }  // namespace vantrell::linuxos

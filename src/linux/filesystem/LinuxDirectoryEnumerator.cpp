@@ -1,5 +1,7 @@
 #include "linux/filesystem/LinuxDirectoryEnumerator.h"
 
+#include <unistd.h>
+
 #include <array>
 #include <utility>
 #include <vector>
@@ -42,6 +44,7 @@ LinuxDirectoryEnumerator::LinuxDirectoryEnumerator(FileDescriptor folder, Reques
       _types(types),
       _parent(_request.folder),
       _mount(mountAccessOf(folder.get())),
+      _user(::geteuid()),
       _walk(
           std::move(folder), _request.folder.path(), walkOptions(_request.options),
           [this](const WalkFolder& in, std::span<WalkEntry> entries) { prepare(in, entries); },
@@ -62,7 +65,8 @@ std::optional<FndURL> LinuxDirectoryEnumerator::next() {
 }
 
 bool LinuxDirectoryEnumerator::handleError(const std::string& path, int osError) {
-  return _request.errorHandler(FndURL::fileURLWithPath(path), readError(osError));
+  return _request.errorHandler != nullptr &&
+         _request.errorHandler(FndURL::fileURLWithPath(path), readError(osError));
 }
 
 void LinuxDirectoryEnumerator::prepare(const WalkFolder& folder, std::span<WalkEntry> entries) {
@@ -122,7 +126,7 @@ void LinuxDirectoryEnumerator::rememberValues(const FndURL& url, const WalkEntry
   remember(kValuesOfOneLook);
   if (entry.status.device == folder.status.device) remember(kIdentities);
   if (!_request.wantsAccess) return;
-  view.access = accessTo(folder.descriptor->get(), entry.name.data(), entry.status, _mount);
+  view.access = accessTo(folder.descriptor->get(), entry.name.data(), entry.status, _mount, _user);
   remember(kAccessValues);
 }
 

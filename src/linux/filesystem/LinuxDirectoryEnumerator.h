@@ -23,7 +23,7 @@ class LinuxDirectoryEnumerator : public DirectoryEnumerator {
     FndURL folder;
     std::uint8_t options = 0;  ///< bits of `DirectoryEnumerationOptions`
     bool wantsAccess = false;  ///< IsReadable and IsWritable, which may cost calls of their own
-    DirectoryErrorHandler errorHandler;
+    DirectoryErrorHandler errorHandler;  ///< without one the first error ends the listing
   };
 
   /// `folder` is the request's, opened for reading.
@@ -46,6 +46,7 @@ class LinuxDirectoryEnumerator : public DirectoryEnumerator {
   const TypeRegistry& _types;
   FndURL _parent;  // of the entries given last: they share one URL object
   MountAccess _mount = MountAccess::Unknown;
+  const uid_t _user;
   std::shared_ptr<const EntryInHand> _inHand;
   TreeWalk _walk;  // last: it calls back while it is being made
 };

@@ -2,6 +2,7 @@
 
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -59,7 +60,8 @@ Result<void> LinuxFileSystem::readResourceValues(const FndURL& url, std::span<co
   view.isPackage = status->kind == FileKind::Directory &&
                    _types.typeConformsTo(view.typeIdentifier, kPackageTypeIdentifier);
   if (holds(keys, Key::IsReadable) || holds(keys, Key::IsWritable)) {
-    view.access = accessTo(spot->folder(), spot->name(), *status, MountAccess::Unknown);
+    view.access =
+        accessTo(spot->folder(), spot->name(), *status, MountAccess::Unknown, ::geteuid());
   }
   const bool isNamed =
       holds(keys, Key::DocumentIdentifier) && isDocument(status->kind, view.isPackage);

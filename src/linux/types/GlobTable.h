@@ -3,8 +3,9 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
+
+#include "linux/types/StringMap.h"
 
 namespace vantrell::linuxos {
 
@@ -30,12 +31,6 @@ class GlobTable {
   std::string_view typeForName(std::string_view name) const;
 
  private:
-  struct Hash {
-    using is_transparent = void;
-    std::size_t operator()(std::string_view text) const {
-      return std::hash<std::string_view>()(text);
-    }
-  };
   struct Candidate {
     int weight = 0;
     std::size_t length = 0;  // of the whole pattern, in bytes
@@ -48,8 +43,8 @@ class GlobTable {
   };
   // What is compared with the name as it is, or with the name in lower case.
   struct Patterns {
-    std::unordered_map<std::string, Candidate, Hash, std::equal_to<>> literals;
-    std::unordered_map<std::string, Candidate, Hash, std::equal_to<>> dotSuffixes;
+    StringMap<Candidate> literals;
+    StringMap<Candidate> dotSuffixes;
     std::vector<Glob> otherSuffixes;  // "*~": too few to be worth a table
     std::vector<Glob> globs;
 

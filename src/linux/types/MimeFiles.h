@@ -3,19 +3,19 @@
 #include <functional>
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
 
 #include "linux/types/GlobTable.h"
+#include "linux/types/StringMap.h"
 
 namespace vantrell::linuxos {
 
 /// What the files of the shared MIME databases say, the databases' own rules of precedence among
 /// folders applied.
 struct MimeDatabase {
-  std::vector<GlobRule> globs;                           ///< the most important first
-  std::unordered_map<std::string, std::string> aliases;  ///< to the type it stands for
-  std::unordered_map<std::string, std::vector<std::string>> supertypes;
+  std::vector<GlobRule> globs;     ///< the most important first
+  StringMap<std::string> aliases;  ///< to the type it stands for
+  StringMap<std::vector<std::string>> supertypes;
 };
 
 /// Reads "globs2", "aliases" and "subclasses" of each folder, the most important folder first. A

@@ -62,11 +62,11 @@ std::string_view PackageTypes::typeForFolderName(std::string_view name) const {
 }
 
 bool PackageTypes::isPackageType(std::string_view type) const {
-  return _descriptions.contains(std::string(type));
+  return _descriptions.contains(type);
 }
 
 std::string_view PackageTypes::descriptionOfType(std::string_view type) const {
-  const auto found = _descriptions.find(std::string(type));
+  const auto found = _descriptions.find(type);
   return found == _descriptions.end() ? std::string_view() : std::string_view(found->second);
 }
 

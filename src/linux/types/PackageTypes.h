@@ -2,8 +2,9 @@
 
 #include <string>
 #include <string_view>
-#include <unordered_map>
 #include <vector>
+
+#include "linux/types/StringMap.h"
 
 namespace vantrell::linuxos {
 
@@ -30,8 +31,8 @@ class PackageTypes {
  private:
   void readFile(const std::string& path);
 
-  std::unordered_map<std::string, std::string> _typesByExtension;  // in lower case, without dot
-  std::unordered_map<std::string, std::string> _descriptions;      // of every declared type
+  StringMap<std::string> _typesByExtension;  // in lower case, without dot
+  StringMap<std::string> _descriptions;      // of every declared type
 };
 
 }  // namespace vantrell::linuxos

@@ -93,14 +93,15 @@ std::string SharedMimeTypes::typeIdentifierForName(std::string_view name, FileKi
 }
 
 std::string_view SharedMimeTypes::canonicalType(std::string_view type) const {
-  const auto alias = _database.aliases.find(std::string(type));
+  const auto alias = _database.aliases.find(type);
   return alias == _database.aliases.end() ? type : std::string_view(alias->second);
 }
 
 bool SharedMimeTypes::typeConformsTo(std::string_view type, std::string_view supertype) const {
   if (type == supertype) return true;
-  const bool isPackage = type == kPackageTypeIdentifier || _packages.isPackageType(type);
-  if (isPackage) return supertype == kPackageTypeIdentifier;
+  // Every listed item is asked this: what is declared here is settled before the database is.
+  if (_packages.isPackageType(type)) return supertype == kPackageTypeIdentifier;
+  if (type == kPackageTypeIdentifier || supertype == kPackageTypeIdentifier) return false;
 
   const std::string_view wanted = canonicalType(supertype);
   // Breadth first over the types above; each is visited once, so that cycles end.
@@ -110,7 +111,7 @@ bool SharedMimeTypes::typeConformsTo(std::string_view type, std::string_view sup
     if (current == wanted) return true;
     if (wanted == kDataTypeIdentifier && !current.starts_with("inode/")) return true;
     if (wanted == "text/plain" && current.starts_with("text/")) return true;
-    const auto supertypes = _database.supertypes.find(std::string(current));
+    const auto supertypes = _database.supertypes.find(current);
     if (supertypes == _database.supertypes.end()) continue;
     for (const std::string& next : supertypes->second) {
       const std::string_view canonical = canonicalType(next);

@@ -1,12 +1,12 @@
 #pragma once
 
 #include <string>
-#include <unordered_map>
 #include <vector>
 
 #include "linux/types/GlobTable.h"
 #include "linux/types/MimeFiles.h"
 #include "linux/types/PackageTypes.h"
+#include "linux/types/StringMap.h"
 #include "platform/foundation/Mutex.h"
 #include "platform/types/TypeRegistry.h"
 
@@ -47,7 +47,7 @@ class SharedMimeTypes : public TypeRegistry {
   GlobTable _globs;
   PackageTypes _packages;
   mutable Mutex _mutex;
-  mutable std::unordered_map<std::string, std::string> _descriptions VANTRELL_GUARDED_BY(_mutex);
+  mutable StringMap<std::string> _descriptions VANTRELL_GUARDED_BY(_mutex);
 };
 
 }  // namespace vantrell::linuxos
