@@ -23,13 +23,14 @@ Installed& installed() {
 }
 
 void uninstall() {
-  // The objects go outside the lock: their destructors may still ask for services.
+  // The objects go outside the lock: their destructors may still ask for services, and for other
+  // objects, which then go in the next round.
   std::map<std::type_index, std::shared_ptr<void>> objects;
-  {
+  do {
+    objects.clear();
     const std::lock_guard lock(installed().mutex);
     objects.swap(installed().objects);
-  }
-  objects.clear();
+  } while (!objects.empty());
   installed().present = false;
   installed().services = {};
 }

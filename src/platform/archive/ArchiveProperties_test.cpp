@@ -63,10 +63,10 @@ rc::Gen<PropertyListValue> anyPropertyList(int depth) {
   using Entry = std::pair<std::string, PropertyListValue>;
   return rc::gen::oneOf(
       anyPropertyListScalar(),
-      rc::gen::map(rc::gen::scale(0.2, rc::gen::container<PropertyListValue::Array>(element)),
+      rc::gen::map(rc::gen::scale(0.1, rc::gen::container<PropertyListValue::Array>(element)),
                    wrapped),
       rc::gen::map(
-          rc::gen::scale(0.2,
+          rc::gen::scale(0.1,
                          rc::gen::container<std::vector<Entry>>(rc::gen::pair(anyText(), element))),
           [](const std::vector<Entry>& entries) {
             return PropertyListValue(PropertyListValue::Dictionary(entries.begin(), entries.end()));
@@ -78,7 +78,7 @@ rc::Gen<ArchiveValue> anyArchive(int depth);
 rc::Gen<ArchiveValue::Dictionary> anyFields(int depth) {
   using Entry = std::pair<std::string, ArchiveValue>;
   const auto element = rc::gen::lazy([depth] { return anyArchive(depth); });
-  return rc::gen::map(rc::gen::scale(0.2, rc::gen::container<std::vector<Entry>>(
+  return rc::gen::map(rc::gen::scale(0.1, rc::gen::container<std::vector<Entry>>(
                                               rc::gen::pair(anyText(), element))),
                       [](const std::vector<Entry>& entries) {
                         return ArchiveValue::Dictionary(entries.begin(), entries.end());
@@ -98,7 +98,7 @@ rc::Gen<ArchiveValue> anyArchive(int depth) {
   const auto wrapped = [](auto value) { return ArchiveValue(std::move(value)); };
   return rc::gen::oneOf(
       anyArchiveScalar(),
-      rc::gen::map(rc::gen::scale(0.2, rc::gen::container<ArchiveValue::List>(element)), wrapped),
+      rc::gen::map(rc::gen::scale(0.1, rc::gen::container<ArchiveValue::List>(element)), wrapped),
       rc::gen::map(anyFields(depth - 1), wrapped),
       rc::gen::map(rc::gen::pair(anyText(), anyFields(depth - 1)), [](const auto& parts) {
         return ArchiveValue(ArchiveValue::Record{"App" + parts.first, parts.second});

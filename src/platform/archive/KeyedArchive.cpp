@@ -1,5 +1,7 @@
 #include "platform/archive/KeyedArchive.h"
 
+#include "platform/archive/KeyedArchiveFormat.h"
+
 namespace vantrell {
 namespace {
 
@@ -36,6 +38,13 @@ std::string_view archiveClassName(ArchiveClass archiveClass) {
       return "FndObject";
   }
   return {};
+}
+
+bool keyedarchive::isReservedClassName(std::string_view name) {
+  for (int i = 0; i <= static_cast<int>(ArchiveClass::Record); ++i) {
+    if (name == archiveClassName(static_cast<ArchiveClass>(i))) return true;
+  }
+  return false;
 }
 
 bool ArchiveValue::Record::operator==(const Record& other) const {

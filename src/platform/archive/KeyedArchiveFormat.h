@@ -49,4 +49,7 @@ inline constexpr std::uint64_t kVersion = 100000;
 /// The most bytes of a value that is written once, however often it stands in an archive.
 inline constexpr std::size_t kLongestShared = 64;
 
+/// True for what `archiveClassName` gives: no record may be called so.
+bool isReservedClassName(std::string_view name);
+
 }  // namespace vantrell::keyedarchive

@@ -39,13 +39,6 @@ std::unexpected<FndError> refused(std::string why) {
                                             "This cannot be archived: " + std::move(why) + "."));
 }
 
-bool isReservedClassName(std::string_view name) {
-  for (int i = 0; i <= static_cast<int>(ArchiveClass::Record); ++i) {
-    if (name == archiveClassName(static_cast<ArchiveClass>(i))) return true;
-  }
-  return false;
-}
-
 class Archiver {
  public:
   Result<FndData> archive(const ArchiveValue& root) {

@@ -109,6 +109,7 @@ class Unarchiver {
     if (**name == archiveClassName(ArchiveClass::Dictionary)) {
       return dictionary(fields, index, depth, slot);
     }
+    if (isReservedClassName(**name)) return damagedObject("an instance that is no record", index);
     return record(**name, fields, depth, slot);
   }
 

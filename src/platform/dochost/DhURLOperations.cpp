@@ -20,13 +20,8 @@ DhURLRelationship relationshipOfPaths(std::string_view folder, std::string_view 
   return item == folder ? DhURLRelationship::Same : DhURLRelationship::Other;
 }
 
-bool hasParentReference(std::string_view path) {
-  const std::size_t found = path.find("/..");
-  return found != std::string_view::npos;
-}
-
 FndURL canonical(const FndURL& url) {
-  if (!hasParentReference(url.path())) return url;  // "/..." as a name costs a look, no more
+  if (!url.hasParentReference()) return url;
   auto resolved = platform::services().fileSystem->canonicalURL(url);
   return resolved ? *resolved : url;
 }
@@ -44,7 +39,9 @@ DhURLRelationship dh_relationshipToItemAtURL(const FndURL& folder, const FndURL&
   if (!folder.isFileURL() || !item.isFileURL()) {
     return folder == item ? DhURLRelationship::Same : DhURLRelationship::Other;
   }
-  if (!hasParentReference(item.path())) return relationshipOfPaths(folder.path(), item.path());
+  if (!folder.hasParentReference() && !item.hasParentReference()) {
+    return relationshipOfPaths(folder.path(), item.path());
+  }
   return relationshipOfPaths(canonical(folder).path(), canonical(item).path());
 }
 

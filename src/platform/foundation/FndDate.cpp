@@ -11,6 +11,7 @@ namespace {
 constexpr std::int64_t kReferenceDate = 978307200;  // 2001-01-01T00:00:00Z in Unix time
 constexpr double kMillionYears = 3.2e13;            // in seconds
 constexpr std::uint32_t kNanosecondsPerSecond = 1'000'000'000;
+constexpr std::int64_t kSecondsPerDay = 86400;
 
 // Reads `width` digits at the front of `text` and takes them off it.
 std::optional<int> digits(std::string_view& text, std::size_t width) {
@@ -82,6 +83,39 @@ std::optional<std::int64_t> zoneOffset(std::string_view& text) {
   return west ? -seconds : seconds;
 }
 
+std::int64_t floorDivide(std::int64_t value, std::int64_t by) {
+  return value / by - (value % by < 0 ? 1 : 0);
+}
+
+std::int64_t floorRemainder(std::int64_t value, std::int64_t by) {
+  return value % by + (value % by < 0 ? by : 0);
+}
+
+struct CalendarDay {
+  std::int64_t year;
+  int month;
+  int day;
+};
+
+// The Gregorian calendar in 64 bits: the standard library's ends with the year 32767, and a file
+// may claim to be from far beyond. Years are counted from March here, so that the leap day comes
+// last, in cycles of 400 years.
+CalendarDay calendarDayOf(std::int64_t daysSince1970) {
+  constexpr std::int64_t kDaysInCycle = 146097;
+  constexpr std::int64_t kDaysFromMarchOfYear0 = 719468;
+  const std::int64_t days = daysSince1970 + kDaysFromMarchOfYear0;
+  const std::int64_t dayOfCycle = floorRemainder(days, kDaysInCycle);
+  const std::int64_t yearOfCycle =
+      (dayOfCycle - dayOfCycle / 1460 + dayOfCycle / 36524 - dayOfCycle / (kDaysInCycle - 1)) / 365;
+  const std::int64_t dayOfYear =
+      dayOfCycle - (365 * yearOfCycle + yearOfCycle / 4 - yearOfCycle / 100);
+  const auto monthFromMarch = static_cast<int>((5 * dayOfYear + 2) / 153);
+  const auto day = static_cast<int>(dayOfYear) - (153 * monthFromMarch + 2) / 5 + 1;
+  const int month = monthFromMarch < 10 ? monthFromMarch + 3 : monthFromMarch - 9;
+  const std::int64_t year = floorDivide(days, kDaysInCycle) * 400 + yearOfCycle;
+  return {month <= 2 ? year + 1 : year, month, day};
+}
+
 }  // namespace
 
 FndDate FndDate::fromUnixTime(std::int64_t seconds, std::uint32_t nanoseconds) {
@@ -110,7 +144,7 @@ std::optional<FndDate> FndDate::fromRFC3339(std::string_view text) {
   if (!nanoseconds) return std::nullopt;
   const auto offset = zoneOffset(text);
   if (!offset || !text.empty()) return std::nullopt;
-  return FndDate(*day * 86400 + *second - *offset, *nanoseconds);
+  return FndDate(*day * kSecondsPerDay + *second - *offset, *nanoseconds);
 }
 
 double FndDate::secondsSinceReferenceDate() const {
@@ -120,15 +154,14 @@ double FndDate::secondsSinceReferenceDate() const {
 }
 
 std::string FndDate::description() const {
-  const std::chrono::sys_seconds moment{std::chrono::seconds(_seconds)};
-  const auto midnight = std::chrono::floor<std::chrono::days>(moment);
-  const std::chrono::year_month_day date{midnight};
-  const auto time = (moment - midnight).count();
+  const CalendarDay day = calendarDayOf(floorDivide(_seconds, kSecondsPerDay));
+  const auto time = static_cast<int>(floorRemainder(_seconds, kSecondsPerDay));
   std::array<char, 64> text{};
-  int length = std::snprintf(text.data(), text.size(), "%04d-%02u-%02uT%02d:%02d:%02d",
-                             static_cast<int>(date.year()), static_cast<unsigned>(date.month()),
-                             static_cast<unsigned>(date.day()), static_cast<int>(time / 3600),
-                             static_cast<int>(time / 60 % 60), static_cast<int>(time % 60));
+  const bool isFourDigits = day.year >= 0 && day.year <= 9999;
+  int length = std::snprintf(
+      text.data(), text.size(),
+      isFourDigits ? "%04lld-%02d-%02dT%02d:%02d:%02d" : "%+05lld-%02d-%02dT%02d:%02d:%02d",
+      static_cast<long long>(day.year), day.month, day.day, time / 3600, time / 60 % 60, time % 60);
   std::string result(text.data(), static_cast<std::size_t>(length));
   if (_nanoseconds != 0) {
     length = std::snprintf(text.data(), text.size(), ".%09u", _nanoseconds);

@@ -26,7 +26,8 @@ class FndDate {
   std::uint32_t nanoseconds() const { return _nanoseconds; }
   double secondsSinceReferenceDate() const;
 
-  /// RFC 3339 in UTC; a fraction only when there is one, without trailing zeros.
+  /// RFC 3339 in UTC; a fraction only when there is one, without trailing zeros. A year that has
+  /// not four digits gets a sign: "+12026-01-01T00:00:00Z".
   std::string description() const;
 
   auto operator<=>(const FndDate&) const = default;

@@ -11,6 +11,7 @@ namespace vantrell {
 namespace {
 
 constexpr std::string_view kFileScheme = "file://";
+constexpr std::string_view kFileSchemeWithoutHost = "file:/";
 constexpr std::string_view kHexDigits = "0123456789ABCDEF";
 
 // Calls `each` with every component of `path` that is neither empty nor ".".
@@ -24,20 +25,20 @@ void forEachComponent(std::string_view path, const Each& each) {
   }
 }
 
-std::string cleanPath(std::string_view path) {
-  std::string clean;
-  clean.reserve(path.size() + 1);
-  forEachComponent(path, [&clean](std::string_view component) {
-    clean += '/';
-    clean += component;
-  });
-  if (clean.empty()) clean = "/";
-  return clean;
+bool isLetter(char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z'); }
+
+bool isLetterOrDigitOr(std::string_view others, char c) {
+  return isLetter(c) || (c >= '0' && c <= '9') || others.find(c) != std::string_view::npos;
 }
 
-bool isUnreserved(char c) {
-  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') ||
-         std::string_view("-._~/!$&'()*+,;=:@").find(c) != std::string_view::npos;
+bool isUnreserved(char c) { return isLetterOrDigitOr("-._~/!$&'()*+,;=:@", c); }
+
+bool hasScheme(std::string_view text) {
+  const std::size_t colon = text.find(':');
+  if (colon == std::string_view::npos || !isLetter(text.front())) return false;
+  const std::string_view scheme = text.substr(0, colon);
+  return std::all_of(scheme.begin(), scheme.end(),
+                     [](char c) { return isLetterOrDigitOr("+-.", c); });
 }
 
 int hexValue(char c) {
@@ -59,11 +60,19 @@ std::string percentDecoded(std::string_view text) {
   return bytes;
 }
 
+// U+0000 to U+001F, U+007F to U+009F: a terminal obeys the upper ones as well.
+bool isControl(std::string_view character) {
+  const auto lead = static_cast<unsigned char>(character.front());
+  if (character.size() == 1) return lead < 0x20 || lead == 0x7f;
+  return lead == 0xc2 && static_cast<unsigned char>(character[1]) < 0xa0;
+}
+
 }  // namespace
 
 struct FndURL::Object {
   std::string text;  // the path of a file URL, the whole text of any other
   bool isFile = true;
+  bool hasParentReference = false;
   std::mutex mutex;
   std::vector<std::pair<FndURLResourceKey, ResourceValue>> values;  // guarded by mutex
 };
@@ -88,19 +97,27 @@ std::string_view resourceKeyName(FndURLResourceKey key) {
 
 FndURL FndURL::fileURLWithPath(std::string_view path) {
   auto object = std::make_shared<Object>();
-  object->text = cleanPath(path);
+  std::string& clean = object->text;
+  clean.reserve(path.size() + 1);
+  forEachComponent(path, [&clean, &object](std::string_view component) {
+    clean += '/';
+    clean += component;
+    if (component == "..") object->hasParentReference = true;
+  });
+  if (clean.empty()) clean = "/";
   return FndURL(std::move(object));
 }
 
 std::optional<FndURL> FndURL::URLWithString(std::string_view text) {
-  if (text.starts_with(kFileScheme)) {
-    const std::string_view rest = text.substr(kFileScheme.size());
-    const std::size_t slash = rest.find('/');  // what stands before it is a host: ours
+  if (text.starts_with(kFileSchemeWithoutHost)) {
+    const bool hasHost = text.starts_with(kFileScheme);  // what stands there is ours
+    const std::size_t slash = text.find('/', hasHost ? kFileScheme.size() : 0);
     if (slash == std::string_view::npos) return std::nullopt;
-    return fileURLWithPath(percentDecoded(rest.substr(slash)));
+    const std::string path = percentDecoded(text.substr(slash));
+    if (path.find('\0') != std::string::npos) return std::nullopt;  // no path has that byte
+    return fileURLWithPath(path);
   }
-  const std::size_t colon = text.find(':');
-  if (colon == 0 || colon == std::string_view::npos) return std::nullopt;
+  if (!hasScheme(text)) return std::nullopt;
   auto object = std::make_shared<Object>();
   object->text = text;
   object->isFile = false;
@@ -113,6 +130,8 @@ const std::string& FndURL::path() const {
   static const std::string kNone;
   return _object->isFile ? _object->text : kNone;
 }
+
+bool FndURL::hasParentReference() const { return _object->hasParentReference; }
 
 std::string FndURL::standardizedPath() const {
   std::vector<std::string_view> kept;
@@ -212,7 +231,7 @@ std::string displayText(std::string_view bytes) {
   while (!bytes.empty()) {
     const auto byte = static_cast<unsigned char>(bytes.front());
     std::size_t length = utf8SequenceLength(bytes);
-    if (length == 0 || byte < 0x20 || byte == 0x7f) {
+    if (length == 0 || isControl(bytes.substr(0, length))) {
       shown += "\\x";
       shown += kHexDigits[byte >> 4];
       shown += kHexDigits[byte & 15];

@@ -48,12 +48,15 @@ class FndURL {
 
   /// `path` should be absolute; a relative one counts from "/".
   static FndURL fileURLWithPath(std::string_view path);
-  /// Reads "file:///a%20b" or a URL of another scheme; none without a scheme.
+  /// Reads "file:///a%20b" or a URL of another scheme; none without a scheme, and for an escaped
+  /// NUL in a path.
   static std::optional<FndURL> URLWithString(std::string_view text);
 
   bool isFileURL() const;
   /// Absolute, without trailing slash; empty for another scheme.
   const std::string& path() const;
+  /// True when a component is "..": where the path leads is then known to the disk alone.
+  bool hasParentReference() const;
   /// The path with "." and ".." folded by its text alone.
   std::string standardizedPath() const;
   /// "/" for the root. The view lives as long as the URL object.
