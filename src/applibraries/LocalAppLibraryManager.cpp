@@ -57,7 +57,8 @@ bool isOnStorageVolume(const FndURL& libraryRoot) {
 
 LocalAppLibraryManager::LocalAppLibraryManager()
     : _appLibrariesByItemIDs(std::make_shared<AppLibraries>()),
-      _bundleProxiesByRootURLs(std::make_shared<BundleProxies>()) {
+      _bundleProxiesByRootURLs(std::make_shared<BundleProxies>()),
+      _rootURLs(std::make_shared<std::vector<FndURL>>()) {
   buildMaps(retrieveAppLibraries());
 }
 
@@ -92,9 +93,12 @@ void LocalAppLibraryManager::buildMaps(const Records& records) {
     (*proxies)[item->fileURL()] = proxy;
     (*libraries)[item->itemIdentifier()] = std::move(item);
   }
+  auto roots = std::make_shared<std::vector<FndURL>>();
+  for (const auto& [root, proxy] : *proxies) roots->push_back(root);
   _queue.sync([&] {
     _appLibrariesByItemIDs = std::move(libraries);
     _bundleProxiesByRootURLs = std::move(proxies);
+    _rootURLs = std::move(roots);
   });
 }
 
@@ -108,12 +112,17 @@ LocalAppLibraryManager::bundleProxiesByRootURLs() const {
   return _queue.sync([this] { return _bundleProxiesByRootURLs; });
 }
 
+std::shared_ptr<const std::vector<FndURL>> LocalAppLibraryManager::rootURLs() const {
+  return _queue.sync([this] { return _rootURLs; });
+}
+
 std::optional<std::string> LocalAppLibraryManager::bundleIdentifierOfLibraryContaining(
     const FndURL& url) const {
-  const auto proxies = bundleProxiesByRootURLs();
-  for (const auto& [root, proxy] : *proxies) {
+  const auto [roots, proxies] =
+      _queue.sync([this] { return std::pair(_rootURLs, _bundleProxiesByRootURLs); });
+  for (const FndURL& root : *roots) {
     if (dh_relationshipToItemAtURL(root, url) == DhURLRelationship::Contains) {
-      return proxy->bundleIdentifier();
+      return proxies->at(root)->bundleIdentifier();
     }
   }
   return std::nullopt;

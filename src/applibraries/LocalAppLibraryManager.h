@@ -34,9 +34,11 @@ class LocalAppLibraryManager {
   /// machine without a registry.
   static Records retrieveAppLibraries();
 
-  // Both maps are replaced, never changed: a caller may walk the one it got at its leisure.
+  // The maps are replaced, never changed: a caller may walk the one it got at its leisure.
   std::shared_ptr<const AppLibraries> appLibrariesByItemIDs() const;
   std::shared_ptr<const BundleProxies> bundleProxiesByRootURLs() const;
+  /// The keys of `bundleProxiesByRootURLs`, in their order.
+  std::shared_ptr<const std::vector<FndURL>> rootURLs() const;
 
   /// The bundle identifier of the first library whose root contains `url`.
   std::optional<std::string> bundleIdentifierOfLibraryContaining(const FndURL& url) const;
@@ -47,6 +49,7 @@ class LocalAppLibraryManager {
   SerialQueue _queue{"vantrell.app-library-manager"};
   std::shared_ptr<const AppLibraries> _appLibrariesByItemIDs;     // touched on _queue
   std::shared_ptr<const BundleProxies> _bundleProxiesByRootURLs;  // touched on _queue
+  std::shared_ptr<const std::vector<FndURL>> _rootURLs;           // touched on _queue
 };
 
 }  // namespace vantrell

@@ -109,7 +109,7 @@ TEST_F(AppLibraryManagerTest, TheMapsLeadFromIdentifiersToItemsAndFromRootsToRec
   EXPECT_EQ(libraries->at("#b")->fileURL(), FndURL::fileURLWithPath("/apps/b/Documents"));
   ASSERT_EQ(proxies->size(), 2U);
   EXPECT_EQ(proxies->at(FndURL::fileURLWithPath("/apps/a/Documents"))->bundleIdentifier(), "a");
-  EXPECT_THAT(ZubAppLibraryManager::rootURLsForAppLibraries(),
+  EXPECT_THAT(*ZubAppLibraryManager::rootURLsForAppLibraries(),
               ElementsAre(FndURL::fileURLWithPath("/apps/a/Documents"),
                           FndURL::fileURLWithPath("/apps/b/Documents")));
 }
@@ -138,7 +138,7 @@ TEST_F(AppLibraryManagerTest, ARecordThatGivesNoItemIsADebugLine) {
 TEST_F(AppLibraryManagerTest, ALibraryOnAnotherVolumeIsLeftOutWithAnErrorLine) {
   system.appreg.addApplication(application("a"));
   system.tree.mount("/apps/a/Documents", DeviceID{77});
-  EXPECT_THAT(ZubAppLibraryManager::rootURLsForAppLibraries(), IsEmpty());
+  EXPECT_THAT(*ZubAppLibraryManager::rootURLsForAppLibraries(), IsEmpty());
   EXPECT_TRUE(system.log.has(LogLevel::Error,
                              "[ERROR] app library at file:///apps/a/Documents is left out: it is "
                              "not on the storage's volume"));
@@ -161,7 +161,7 @@ TEST_F(AppLibraryManagerTest, TheSharedManagerIsMadeOnceForAnInstallation) {
   const auto first = &LocalAppLibraryManager::sharedManager();
   system.appreg.addApplication(application("b"));
   EXPECT_EQ(&LocalAppLibraryManager::sharedManager(), first);
-  EXPECT_EQ(ZubAppLibraryManager::rootURLsForAppLibraries().size(), 1U);
+  EXPECT_EQ(ZubAppLibraryManager::rootURLsForAppLibraries()->size(), 1U);
 }
 
 TEST(AppLibraryManagerWithoutRegistry, HoldsNothing) {
@@ -169,7 +169,7 @@ TEST(AppLibraryManagerWithoutRegistry, HoldsNothing) {
   platform::Services services;
   services.log = &log;
   const platform::Installation installation = platform::install(services);
-  EXPECT_THAT(ZubAppLibraryManager::rootURLsForAppLibraries(), IsEmpty());
+  EXPECT_THAT(*ZubAppLibraryManager::rootURLsForAppLibraries(), IsEmpty());
 }
 
 }  // namespace

@@ -4,12 +4,8 @@
 
 namespace vantrell {
 
-std::vector<FndURL> ZubAppLibraryManager::rootURLsForAppLibraries() {
-  const auto proxies = LocalAppLibraryManager::sharedManager().bundleProxiesByRootURLs();
-  std::vector<FndURL> roots;
-  roots.reserve(proxies->size());
-  for (const auto& [root, proxy] : *proxies) roots.push_back(root);
-  return roots;
+std::shared_ptr<const std::vector<FndURL>> ZubAppLibraryManager::rootURLsForAppLibraries() {
+  return LocalAppLibraryManager::sharedManager().rootURLs();
 }
 
 }  // namespace vantrell

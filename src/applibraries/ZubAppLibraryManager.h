@@ -1,5 +1,6 @@
 #pragma once
 
+#include <memory>
 #include <vector>
 
 #include "platform/foundation/FndURL.h"
@@ -13,8 +14,9 @@ class ZubAppLibraryManager {
  public:
   ZubAppLibraryManager() = delete;
 
-  /// The root folders of all app libraries that the shared manager holds.
-  static std::vector<FndURL> rootURLsForAppLibraries();
+  /// The root folders of all app libraries that the shared manager holds. Shared, because they
+  /// are asked for with every item that is not in the storage.
+  static std::shared_ptr<const std::vector<FndURL>> rootURLsForAppLibraries();
 };
 
 }  // namespace vantrell

@@ -41,28 +41,38 @@ struct KnownNumber {
   std::uint64_t value = 0;
 };
 
-KnownNumber knownNumber(const FndURL& url, FndURLResourceKey key, std::string_view keyInMessages,
-                        std::string_view what) {
+// The texts about one of these keys.
+struct KeyTexts {
+  std::string_view cannotRead;
+  std::string_view unexpectedClass;
+};
+constexpr KeyTexts kFileIDTexts = {"can't get resource value for _kKorURLFileIDKey; ",
+                                   "unexpected class for file ID (expected: FndNumber, actual: "};
+constexpr KeyTexts kDocumentIDTexts = {
+    "can't get resource value for FndURLDocumentIdentifierKey; ",
+    "unexpected class for doc ID (expected: FndNumber, actual: "};
+
+KnownNumber knownNumber(const FndURL& url, FndURLResourceKey key, const KeyTexts& texts) {
   const auto value = resourceValue(url, key);
   if (!value) {
-    log(isNoSuchFileReadError(value.error()) ? LogLevel::Debug : LogLevel::Error,
-        "can't get resource value for ", keyInMessages, "; ", value.error());
+    log(isNoSuchFileReadError(value.error()) ? LogLevel::Debug : LogLevel::Error, texts.cannotRead,
+        value.error());
     return {KnownNumber::State::Failed};
   }
   if (!*value) return {KnownNumber::State::Absent};
   const FndNumber* number = std::get_if<FndNumber>(&**value);
   const auto exact = number == nullptr ? std::nullopt : number->exactUInt64();
   if (exact) return {KnownNumber::State::Known, *exact};
-  std::string message = "unexpected class for ";
-  message.append(what).append(" (expected: FndNumber, actual: ").append(className(**value));
-  developmentAssert(false, message + ")");
+  std::string message(texts.unexpectedClass);
+  developmentAssert(false, message.append(className(**value)).append(")"));
   return {KnownNumber::State::Failed};
 }
 
 // True for a URL in the storage or in an app library. Fills `libraryRoot` when the URL is the
 // root folder of one.
 bool isPartOfVantrell(const FndURL& url, std::optional<FndURL>& libraryRoot) {
-  for (const FndURL& root : ZubAppLibraryManager::rootURLsForAppLibraries()) {
+  const auto roots = ZubAppLibraryManager::rootURLsForAppLibraries();
+  for (const FndURL& root : *roots) {
     const DhURLRelationship relationship = dh_relationshipToItemAtURL(root, url);
     if (relationship == DhURLRelationship::Same) libraryRoot = root;
     if (relationship != DhURLRelationship::Other) return true;
@@ -120,10 +130,9 @@ std::optional<DochostItemIdentifier> identifierFromFileSystem(const FndURL& url)
 
 std::optional<DochostItemIdentifier> identifierInsideStorage(const FndURL& url) {
   const bool isFolder = dh_isFolder(url);
-  const KnownNumber known = isFolder ? knownNumber(url, FndURLResourceKey::FileResourceIdentifier,
-                                                   "_kKorURLFileIDKey", "file ID")
-                                     : knownNumber(url, FndURLResourceKey::DocumentIdentifier,
-                                                   "FndURLDocumentIdentifierKey", "doc ID");
+  const KnownNumber known =
+      isFolder ? knownNumber(url, FndURLResourceKey::FileResourceIdentifier, kFileIDTexts)
+               : knownNumber(url, FndURLResourceKey::DocumentIdentifier, kDocumentIDTexts);
   if (known.state == KnownNumber::State::Failed) return std::nullopt;
   if (known.state == KnownNumber::State::Absent) return identifierFromFileSystem(url);
   if (isFolder) return ZubFileObjectIdentifier::fromFileID(FileID{known.value});

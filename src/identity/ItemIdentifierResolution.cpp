@@ -110,7 +110,8 @@ bool isWithin(const FndURL& root, const FndURL& url) {
 // Whatever number an identifier makes up, it must not lead out of what is shown.
 bool isShown(const FndURL& url) {
   if (isWithin(platform::services().manager->documentStorageURL(), url)) return true;
-  for (const FndURL& root : ZubAppLibraryManager::rootURLsForAppLibraries()) {
+  const auto roots = ZubAppLibraryManager::rootURLsForAppLibraries();
+  for (const FndURL& root : *roots) {
     if (isWithin(root, url)) return true;
   }
   return false;

@@ -61,7 +61,8 @@ std::optional<FndURL> resolved(std::string_view location, const FndURL& libraryR
 }  // namespace
 
 std::optional<FndURL> libraryRootOfItemAt(const FndURL& url) {
-  for (const FndURL& root : ZubAppLibraryManager::rootURLsForAppLibraries()) {
+  const auto roots = ZubAppLibraryManager::rootURLsForAppLibraries();
+  for (const FndURL& root : *roots) {
     if (contains(root, url)) return root;
   }
   const FndURL& storageRoot = platform::services().manager->documentStorageURL();

@@ -27,21 +27,21 @@ void signalWorkingSet() {
 }  // namespace
 
 LocalDochost::LocalDochost()
-    : _appRefreshCompletionHandlers(std::make_shared<Completions>()),
-      _appRefreshQueue("vantrell.app-refresh.queue"),
-      _appRefreshPacer(std::make_shared<DhPacer>("vantrell.app-refresh.pacer", _appRefreshQueue,
-                                                 kLeastTimeBetweenRefreshes)) {
-  _appRefreshPacer->setEventBlock(
-      [waiting = _appRefreshCompletionHandlers] { pacerEvent(*waiting); });
-  _appRefreshPacer->resume();
-  _appRefreshPacer->signal();
+    : appRefreshCompletionHandlers(std::make_shared<Completions>()),
+      appRefreshQueue("vantrell.app-refresh.queue"),
+      appRefreshPacer(std::make_shared<DhPacer>("vantrell.app-refresh.pacer", appRefreshQueue,
+                                                kLeastTimeBetweenRefreshes)) {
+  appRefreshPacer->setEventBlock(
+      [waiting = appRefreshCompletionHandlers] { pacerEvent(*waiting); });
+  appRefreshPacer->resume();
+  appRefreshPacer->signal();
   signalWorkingSet();
 }
 
 LocalDochost::~LocalDochost() {
-  _appRefreshPacer.reset();
+  appRefreshPacer.reset();
   // The services may go next: wait for an event that is running, unless it is what destroys us.
-  if (!_appRefreshQueue.isCurrent()) _appRefreshQueue.sync([] {});
+  if (!appRefreshQueue.isCurrent()) appRefreshQueue.sync([] {});
 }
 
 void LocalDochost::providePlaceholderAtURL_completionHandler(const FndURL&,
@@ -59,8 +59,8 @@ void LocalDochost::itemChangedAtURL(const FndURL&) {}
 void LocalDochost::stopProvidingItemAtURL(const FndURL&) {}
 
 void LocalDochost::_refreshInstalledAppsWithCompletionHandler(ErrorCompletion completion) {
-  _appRefreshQueue.async([waiting = _appRefreshCompletionHandlers, pacer = _appRefreshPacer,
-                          completion = std::move(completion)]() mutable {
+  appRefreshQueue.async([waiting = appRefreshCompletionHandlers, pacer = appRefreshPacer,
+                         completion = std::move(completion)]() mutable {
     waiting->push_back(std::move(completion));
     pacer->signal();
   });

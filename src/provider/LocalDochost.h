@@ -68,10 +68,10 @@ class LocalDochost final : public DochostExtension {
                              ItemCompletion completion);
 
   // Shared with an event that is running on the queue.
-  const std::shared_ptr<Completions> _appRefreshCompletionHandlers;  // touched on the queue
-  const SerialQueue _appRefreshQueue;
+  const std::shared_ptr<Completions> appRefreshCompletionHandlers;  // touched on the queue
+  const SerialQueue appRefreshQueue;
   // Shared with requests that are on their way to the queue.
-  std::shared_ptr<DhPacer> _appRefreshPacer;
+  std::shared_ptr<DhPacer> appRefreshPacer;
 };
 
 }  // namespace vantrell

@@ -4,6 +4,7 @@
 #include <memory>
 #include <utility>
 
+#include "applibraries/LocalAppLibraryManager.h"
 #include "enumeration/FSDirectoryEnumerator.h"
 #include "identity/ItemForIdentifierString.h"
 #include "platform/dochost/DochostErrors.h"
@@ -20,10 +21,13 @@ constexpr std::size_t kPageSize = 200;
 // Turns entries into pages of items.
 class Pages {
  public:
-  Pages(const DochostItemIdentifier& parent, const DochostExtension::PageHandler& handler)
-      : _handler(handler) {
-    // All entries of a folder have one parent: it is looked up once, not for each of them.
-    _options.customParentItemID = parent;
+  Pages(const LocalItem& folder, const DochostExtension::PageHandler& handler) : _handler(handler) {
+    // What all entries of a folder have in common is looked up once, not for each of them.
+    _options.customParentItemID = folder.itemIdentifier();
+    _options.hasLumenDomainIdentifier = false;
+    _options.bundleIdentifier =
+        LocalAppLibraryManager::sharedManager().bundleIdentifierOfLibraryContaining(
+            folder.fileURL().URLByAppendingPathComponent("entry"));
     _items.reserve(kPageSize);
   }
 
@@ -76,7 +80,7 @@ Result<void> LocalDochost::_listItemsInContainer_pageHandler(std::string_view id
                                       .limit = UINT64_MAX,
                                       .errorHandler = standardDirectoryErrorHandler,
                                       .directoryEnumerationOptionsFor = {}};
-  Pages pages((*container)->itemIdentifier(), handler);
+  Pages pages(**container, handler);
   // The scanner finishes a root whatever its handler answers; only an error ends the call.
   const FndError enough = errorWithPOSIXCode(ECANCELED);
   const auto counted = scanner.enumerate([&](const FndURL& url) -> Result<bool> {
