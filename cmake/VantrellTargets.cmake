@@ -1,10 +1,39 @@
 # One folder is one library, with its files listed by name, and one test program.
 
+set(VANTRELL_COMMON_HEADERS <algorithm> <any> <array> <chrono> <cstdint> <expected> <functional>
+    <map> <memory> <mutex> <optional> <span> <string> <string_view> <utility> <variant> <vector>)
+
+# vantrell_share_headers(NAME KIND)
+# Lets a target reuse the precompiled headers of its KIND, library or test: a precompiled header
+# fits only what is compiled with the same options.
+function(vantrell_share_headers name kind)
+  if(NOT VANTRELL_PRECOMPILE)
+    return()
+  endif()
+  set(owner vantrell_${kind}_headers)
+  if(NOT TARGET ${owner})
+    set(source ${PROJECT_BINARY_DIR}/${owner}.cpp)
+    file(CONFIGURE OUTPUT ${source} CONTENT "int main() { return 0; }\n")
+    if(kind STREQUAL "test")
+      add_executable(${owner} ${source})
+      target_link_libraries(${owner} PRIVATE vantrell_flags GTest::gmock GTest::gtest_main)
+      target_precompile_headers(${owner} PRIVATE ${VANTRELL_COMMON_HEADERS}
+        <filesystem> <gmock/gmock.h> <gtest/gtest.h>)
+    else()
+      add_library(${owner} STATIC ${source})
+      target_link_libraries(${owner} PRIVATE vantrell_flags)
+      target_precompile_headers(${owner} PRIVATE ${VANTRELL_COMMON_HEADERS})
+    endif()
+  endif()
+  target_precompile_headers(${name} REUSE_FROM ${owner})
+endfunction()
+
 # vantrell_library(NAME SOURCES a.cpp b.cpp LINK other_library ...)
 function(vantrell_library name)
   cmake_parse_arguments(arg "" "" "SOURCES;LINK" ${ARGN})
   add_library(${name} STATIC ${arg_SOURCES})
   target_link_libraries(${name} PUBLIC vantrell_flags ${arg_LINK})
+  vantrell_share_headers(${name} library)
 endfunction()
 
 # vantrell_test(NAME SOURCES a_test.cpp LINK library ... LABELS label ...)
@@ -19,6 +48,7 @@ function(vantrell_test name)
   endif()
   add_executable(${name} ${arg_SOURCES})
   target_link_libraries(${name} PRIVATE vantrell_flags ${arg_LINK} GTest::gmock GTest::gtest_main)
+  vantrell_share_headers(${name} test)
   foreach(source ${arg_SOURCES})
     cmake_path(ABSOLUTE_PATH source BASE_DIRECTORY ${CMAKE_CURRENT_SOURCE_DIR} NORMALIZE)
     set_property(GLOBAL APPEND PROPERTY VANTRELL_TEST_SOURCES ${source})
