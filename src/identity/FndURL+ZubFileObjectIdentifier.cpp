@@ -6,28 +6,16 @@
 
 #include "applibraries/ZubAppLibraryManager.h"
 #include "identity/FndURL+ZubFileObjectIdentifier.h"
+#include "identity/IdentityLog.h"
 #include "identity/ZubFileObjectIdentifier.h"
 #include "platform/Services.h"
 #include "platform/dochost/DhURLOperations.h"
 #include "platform/filesystem/URLResourceValues.h"
 #include "platform/foundation/Fatal.h"
-#include "platform/foundation/PosixNames.h"
 #include "support/Errors.h"
-#include "support/Log.h"
 
 namespace vantrell {
 namespace {
-
-// Lines of this layer carry no prefix for their level.
-template <class... Pieces>
-void log(LogLevel level, const Pieces&... pieces) {
-  logObject().write(level, pieces...);
-}
-
-// What `log` shows of an error that has an errno value.
-auto errnoText(const FndError& error) {
-  return [code = posixCodeOfError(error)] { return posixErrorDescription(code); };
-}
 
 std::string_view className(const FndURL::ResourceValue& value) {
   static constexpr std::string_view kNames[] = {"FndString",  "FndNumber", "FndDate",
@@ -55,8 +43,8 @@ constexpr KeyTexts kDocumentIDTexts = {
 KnownNumber knownNumber(const FndURL& url, FndURLResourceKey key, const KeyTexts& texts) {
   const auto value = resourceValue(url, key);
   if (!value) {
-    log(isNoSuchFileReadError(value.error()) ? LogLevel::Debug : LogLevel::Error, texts.cannotRead,
-        value.error());
+    logIdentity(isNoSuchFileReadError(value.error()) ? LogLevel::Debug : LogLevel::Error,
+                texts.cannotRead, value.error());
     return {KnownNumber::State::Failed};
   }
   if (!*value) return {KnownNumber::State::Absent};
@@ -93,7 +81,7 @@ std::optional<DochostItemIdentifier> identifierOfDocument(const FndURL& url, Ope
     documentID = verstow.getOrAllocateDocumentID(file).value_or(DocumentID{});
   }
   if (documentID.value == 0) {
-    log(LogLevel::Error, "can't get permanent storage for \"", url.path(), "\"");
+    logIdentity(LogLevel::Error, "can't get permanent storage for \"", url.path(), "\"");
     return std::nullopt;
   }
   url.setCachedResourceValue(FndURLResourceKey::DocumentIdentifier,
@@ -105,21 +93,22 @@ std::optional<DochostItemIdentifier> identifierOfDocument(const FndURL& url, Ope
 std::optional<DochostItemIdentifier> identifierFromFileSystem(const FndURL& url) {
   const auto package = resourceValue(url, FndURLResourceKey::IsPackage);
   if (!package) {
-    log(LogLevel::Error, "can't get resource FndURLIsPackageKey for \"", url.path(), "\"; ",
-        package.error());
+    logIdentity(LogLevel::Error, "can't get resource FndURLIsPackageKey for \"", url.path(), "\"; ",
+                package.error());
     return std::nullopt;
   }
   const bool* const packageFlag = *package ? std::get_if<bool>(&**package) : nullptr;
   const bool isPackage = packageFlag != nullptr && *packageFlag;
   const auto file = platform::services().fileSystem->open(url, OpenMode::EventOnly);
   if (!file) {
-    log(LogLevel::Error, "can't open file at \"", url.path(), "\"; ", errnoText(file.error()));
+    logIdentity(LogLevel::Error, "can't open file at \"", url.path(), "\"; ",
+                errnoText(file.error()));
     return std::nullopt;
   }
   const Result<FileIdentity> identity = (*file)->identity();
   if (!identity) {
-    log(LogLevel::Error, "can't get attribute list for \"", url.path(), "\"; ",
-        errnoText(identity.error()));
+    logIdentity(LogLevel::Error, "can't get attribute list for \"", url.path(), "\"; ",
+                errnoText(identity.error()));
     return std::nullopt;
   }
   const bool isDocument = identity->kind == FileKind::RegularFile ||
@@ -157,7 +146,7 @@ DeviceID deviceID(const FndURL& url) { return deviceIDWithError(url).value_or(De
 
 std::optional<DochostItemIdentifier> itemIdentifier(const FndURL& url) {
   if (!url.isFileURL()) {
-    log(LogLevel::Error, "can't compute file object identifier if not a file URL");
+    logIdentity(LogLevel::Error, "can't compute file object identifier if not a file URL");
     return std::nullopt;
   }
   const FndURL& storageRoot = platform::services().manager->documentStorageURL();
@@ -171,7 +160,7 @@ std::optional<DochostItemIdentifier> itemIdentifier(const FndURL& url) {
   }
   std::optional<FndURL> libraryRoot;
   if (!isPartOfVantrell(url, libraryRoot)) {
-    log(
+    logIdentity(
         LogLevel::Debug, "can't compute file object identifier because \"",
         [&url] { return url.standardizedPath(); }, "\" is not part of Vantrell");
     return std::nullopt;

@@ -11,26 +11,16 @@
 
 #include "applibraries/ZubAppLibraryManager.h"
 #include "identity/FndURL+ZubFileObjectIdentifier.h"
+#include "identity/IdentityLog.h"
 #include "platform/Services.h"
 #include "platform/dochost/DhURLOperations.h"
-#include "platform/foundation/PosixNames.h"
 #include "support/Errors.h"
-#include "support/Log.h"
 
 namespace vantrell {
 namespace {
 
 constexpr int kMostRetries = 5;
 constexpr std::chrono::milliseconds kRestBetweenTries{1};
-
-template <class... Pieces>
-void log(LogLevel level, const Pieces&... pieces) {
-  logObject().write(level, pieces...);
-}
-
-auto errnoText(int osError) {
-  return [osError] { return posixErrorDescription(osError); };
-}
 
 std::vector<std::string_view> splitAtEquals(std::string_view text) {
   std::vector<std::string_view> parts;
@@ -64,8 +54,8 @@ DeviceID storageDevice() {
   const FndURL& storageRoot = platform::services().manager->documentStorageURL();
   const Result<DeviceID> device = deviceIDWithError(storageRoot);
   if (device) return *device;
-  log(LogLevel::Error, "can't get device ID for \"", storageRoot.path(), "\"; ",
-      errnoText(posixCodeOfError(device.error())));
+  logIdentity(LogLevel::Error, "can't get device ID for \"", storageRoot.path(), "\"; ",
+              errnoText(device.error()));
   return {};
 }
 
@@ -87,16 +77,16 @@ std::optional<FileID> resolveDocument(std::int64_t number, DeviceID device) {
   Result<FileID> fileID = resolveOnce(number, device);
   for (int retries = 0; !fileID; ++retries) {
     if (retries == kMostRetries) {
-      log(LogLevel::Debug, "can't resolve doc ID \"", number, "\" after five attempts");
+      logIdentity(LogLevel::Debug, "can't resolve doc ID \"", number, "\" after five attempts");
       return std::nullopt;
     }
     const int osError = posixCodeOfError(fileID.error());
     if (!mayPass(osError)) {
-      log(LogLevel::Error, "can't resolve doc ID \"", number, "\"; ", errnoText(osError));
+      logIdentity(LogLevel::Error, "can't resolve doc ID \"", number, "\"; ", errnoText(osError));
       return std::nullopt;
     }
-    log(LogLevel::Debug, "doc ID resolution failed with errno(", osError,
-        "), let's try again after resting");
+    logIdentity(LogLevel::Debug, "doc ID resolution failed with errno(", osError,
+                "), let's try again after resting");
     platform::services().clock->rest(kRestBetweenTries);
     fileID = resolveOnce(number, device);
   }
@@ -126,13 +116,13 @@ std::optional<FndURL> fileURLWithItemIdentifier(std::string_view identifier) {
   }
   const std::vector<std::string_view> parts = splitAtEquals(identifier);
   if (parts.size() != 2) {
-    log(LogLevel::Error, "invalid identifier; identifier should have 2 components, not ",
-        parts.size());
+    logIdentity(LogLevel::Error, "invalid identifier; identifier should have 2 components, not ",
+                parts.size());
     return std::nullopt;
   }
   const bool isDocument = parts[0] == "did";
   if (!isDocument && parts[0] != "fid") {
-    log(LogLevel::Error, "invalid host for identifier \"", identifier, "\"");
+    logIdentity(LogLevel::Error, "invalid host for identifier \"", identifier, "\"");
     return std::nullopt;
   }
   const DeviceID device = storageDevice();
@@ -159,9 +149,9 @@ std::optional<FndURL> _fileURLWithFileIdentifier_deviceIdentifier(FileID fileID,
     FndURL url = FndURL::fileURLWithPath(*path);
     if (isShown(url)) return url;
   }
-  log(LogLevel::Debug, "can't resolve path matching file ID \"",
-      static_cast<std::int64_t>(fileID.value), "\"; ",
-      errnoText(path ? ENOENT : posixCodeOfError(path.error())));
+  logIdentity(LogLevel::Debug, "can't resolve path matching file ID \"",
+              static_cast<std::int64_t>(fileID.value), "\"; ",
+              errnoText(path ? ENOENT : posixCodeOfError(path.error())));
   return std::nullopt;
 }
 

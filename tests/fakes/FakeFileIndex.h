@@ -70,6 +70,10 @@ class FakeFileIndex : public linuxos::FileIndex {
     if (_batchError) return std::unexpected(FndError::posix(*_batchError));
     std::vector<DocumentID> ids;
     for (const linuxos::SeenObject& document : documents) {
+      if (inodeOf(document.path) != document.fileID.value) {  // gone meanwhile
+        ids.push_back(DocumentID{});
+        continue;
+      }
       if (document.kind != FileKind::RegularFile && !document.isPackage) {
         throw std::logic_error("asked for the document ID of no document: " + document.path);
       }

@@ -7,12 +7,11 @@
 #include <vector>
 
 #include "tests/fakes/FakeDirectoryEnumerator.h"
+#include "tests/fakes/FakeErrors.h"
 #include "tests/fakes/FakeResources.h"
 
 namespace vantrell {
 namespace {
-
-std::unexpected<FndError> fail(int osError) { return std::unexpected(FndError::posix(osError)); }
 
 // Reads by place say in the foundation's words that nothing is there.
 std::unexpected<FndError> failRead(const FndError& error) {
@@ -68,7 +67,7 @@ Result<std::unique_ptr<OpenFile>> FakeFileSystem::open(const FndURL& url, OpenMo
   const auto node = _tree.find(url.path());
   if (!node) return std::unexpected(node.error());
   const bool mayWrite = (*node)->isWritable() || (*node)->kind == FileKind::SymbolicLink;
-  if (mode == OpenMode::ReadWrite && !mayWrite) return fail(EACCES);
+  if (mode == OpenMode::ReadWrite && !mayWrite) return fakeFailure(EACCES);
   return std::make_unique<FakeOpenFile>(_tree, *node, url.path(), mode);
 }
 
@@ -92,8 +91,8 @@ Result<std::unique_ptr<DirectoryEnumerator>> FakeFileSystem::enumerateDirectory(
   }
   const auto node = _tree.find(folder.path());
   if (!node) return failRead(node.error());
-  if ((*node)->kind != FileKind::Directory) return fail(ENOTDIR);
-  if (!(*node)->isReadable()) return fail(EACCES);
+  if ((*node)->kind != FileKind::Directory) return fakeFailure(ENOTDIR);
+  if (!(*node)->isReadable()) return fakeFailure(EACCES);
   return std::make_unique<FakeDirectoryEnumerator>(
       _tree, _types, *node, folder.path(),
       std::vector<FndURLResourceKey>(prefetchedKeys.begin(), prefetchedKeys.end()), options,
@@ -107,13 +106,13 @@ Result<void> FakeFileSystem::createDirectory(const FndURL& url) {
   }
   if (const auto node = _tree.find(url.path())) {
     if ((*node)->kind == FileKind::Directory) return {};
-    return fail(EEXIST);
+    return fakeFailure(EEXIST);
   }
   const FndURL parent = url.URLByDeletingLastPathComponent();
   if (const auto made = createDirectory(parent); !made) return made;
   const auto folder = _tree.find(parent.path());
   if (!folder) return std::unexpected(folder.error());
-  if (!(*folder)->isWritable()) return fail(EACCES);
+  if (!(*folder)->isWritable()) return fakeFailure(EACCES);
   _tree.create(*folder, url.lastPathComponent(), FileKind::Directory);
   return {};
 }
@@ -125,7 +124,7 @@ Result<std::uint64_t> FakeFileSystem::recursiveSizeOfDirectory(const FndURL& url
   }
   const auto node = _tree.find(url.path());
   if (!node) return failRead(node.error());
-  if ((*node)->kind != FileKind::Directory) return fail(ENOTDIR);
+  if ((*node)->kind != FileKind::Directory) return fakeFailure(ENOTDIR);
   return sizeBelow(**node);
 }
 
@@ -153,13 +152,13 @@ Result<FileIdentity> FakeOpenFile::identity() {
 Result<void> FakeOpenFile::setAttribute(std::string_view name, FndDataView value) {
   const std::lock_guard lock(_tree.mutex);
   if (auto error = _tree.faults.next(FakeCall::SetAttribute, _path)) return std::unexpected(*error);
-  if (_mode != OpenMode::ReadWrite) return fail(EACCES);
-  if (!carriesAttributes(*_node)) return fail(EPERM);
+  if (_mode != OpenMode::ReadWrite) return fakeFailure(EACCES);
+  if (!carriesAttributes(*_node)) return fakeFailure(EPERM);
   const auto old = _node->attributes.find(name);
   const std::size_t freed =
       old == _node->attributes.end() ? 0 : old->first.size() + old->second.size();
   const std::size_t needed = attributeBytes(*_node) - freed + name.size() + value.size();
-  if (needed > _tree.attributeCapacity()) return fail(ENOSPC);
+  if (needed > _tree.attributeCapacity()) return fakeFailure(ENOSPC);
   _node->attributes.insert_or_assign(std::string(name), FndData(value.begin(), value.end()));
   return {};
 }
@@ -169,10 +168,10 @@ Result<void> FakeOpenFile::removeAttribute(std::string_view name) {
   if (auto error = _tree.faults.next(FakeCall::RemoveAttribute, _path)) {
     return std::unexpected(*error);
   }
-  if (_mode != OpenMode::ReadWrite) return fail(EACCES);
-  if (!carriesAttributes(*_node)) return fail(EPERM);
+  if (_mode != OpenMode::ReadWrite) return fakeFailure(EACCES);
+  if (!carriesAttributes(*_node)) return fakeFailure(EPERM);
   const auto found = _node->attributes.find(name);
-  if (found == _node->attributes.end()) return fail(ENODATA);
+  if (found == _node->attributes.end()) return fakeFailure(ENODATA);
   _node->attributes.erase(found);
   return {};
 }

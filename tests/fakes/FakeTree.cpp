@@ -4,6 +4,8 @@
 #include <cerrno>
 #include <stdexcept>
 
+#include "tests/fakes/FakeErrors.h"
+
 namespace vantrell {
 namespace {
 
@@ -14,8 +16,6 @@ constexpr int kMostLinks = 40;
 [[noreturn]] void senseless(std::string_view what, std::string_view path) {
   throw std::logic_error(std::string(what) + " \"" + std::string(path) + "\"");
 }
-
-std::unexpected<FndError> fail(int osError) { return std::unexpected(FndError::posix(osError)); }
 
 std::vector<std::string> componentsOf(std::string_view path) {
   std::vector<std::string> parts = FndURL::fileURLWithPath(path).pathComponents();
@@ -228,15 +228,16 @@ Result<Node> FakeTree::find(std::string_view path, FinalLink finalLink) {
   const std::lock_guard lock(mutex);
   Node node = _root;
   for (const std::string& name : componentsOf(path)) {
-    if (node->kind == FileKind::SymbolicLink) return fail(ELOOP);
-    if (node->kind != FileKind::Directory) return fail(ENOTDIR);
-    if (!node->isSearchable()) return fail(EACCES);
+    if (node->kind == FileKind::SymbolicLink) return fakeFailure(ELOOP);
+    if (node->kind != FileKind::Directory) return fakeFailure(ENOTDIR);
+    if (!node->isSearchable()) return fakeFailure(EACCES);
     node = entryOf(*node, name);
-    if (node == nullptr) return fail(ENOENT);
+    if (node == nullptr) return fakeFailure(ENOENT);
   }
   if (node->kind != FileKind::SymbolicLink || finalLink == FinalLink::Stay) return node;
   const auto target = realPath(std::string(path) + "/.");
-  return target ? find(*target, FinalLink::Stay) : fail(static_cast<int>(target.error().code()));
+  return target ? find(*target, FinalLink::Stay)
+                : fakeFailure(static_cast<int>(target.error().code()));
 }
 
 Result<std::string> FakeTree::realPath(std::string_view path) {
@@ -256,16 +257,16 @@ Result<std::string> FakeTree::realPath(std::string_view path) {
     }
     const auto folder = find(real);
     if (!folder) return std::unexpected(folder.error());
-    if ((*folder)->kind != FileKind::Directory) return fail(ENOTDIR);
-    if (!(*folder)->isSearchable()) return fail(EACCES);
+    if ((*folder)->kind != FileKind::Directory) return fakeFailure(ENOTDIR);
+    if (!(*folder)->isSearchable()) return fakeFailure(EACCES);
     const Node entry = entryOf(**folder, name);
     const bool isLast = waiting.empty();
-    if (entry == nullptr && (!isLast || followsLast)) return fail(ENOENT);
+    if (entry == nullptr && (!isLast || followsLast)) return fakeFailure(ENOENT);
     if (entry == nullptr || entry->kind != FileKind::SymbolicLink || (isLast && !followsLast)) {
       real = joined(real, name);
       continue;
     }
-    if (++links > kMostLinks) return fail(ELOOP);
+    if (++links > kMostLinks) return fakeFailure(ELOOP);
     if (entry->linkTarget.starts_with('/')) real = "/";
     std::vector<std::string> target = componentsOf(entry->linkTarget);
     waiting.insert(waiting.end(), target.rbegin(), target.rend());
@@ -279,7 +280,7 @@ Result<std::string> FakeTree::pathOf(DeviceID device, FileID fileID) {
     return node.device == device && node.fileID == fileID;
   });
   if (found) return found->first;
-  return fail(ENOENT);
+  return fakeFailure(ENOENT);
 }
 
 Node FakeTree::nodeOfDocument(DocumentID documentID) {

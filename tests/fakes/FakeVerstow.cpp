@@ -3,16 +3,11 @@
 #include <cerrno>
 #include <stdexcept>
 
+#include "tests/fakes/FakeErrors.h"
 #include "tests/fakes/FakeFileSystem.h"
 #include "tests/fakes/FakeResources.h"
 
 namespace vantrell {
-namespace {
-
-std::unexpected<FndError> fail(int osError) { return std::unexpected(FndError::posix(osError)); }
-
-}  // namespace
-
 void FakeVerstow::needPrepared() const {
   if (!_prepared) throw std::logic_error("the storage service is used before it is prepared");
 }
@@ -24,10 +19,10 @@ Result<FileID> FakeVerstow::resolveDocumentID(DocumentID documentID, DeviceID de
   if (!_failures.empty()) {
     const int osError = _failures.front();
     _failures.erase(_failures.begin());
-    return fail(osError);
+    return fakeFailure(osError);
   }
   const FakeTree::Node node = documentID.value == 0 ? nullptr : _tree.nodeOfDocument(documentID);
-  if (node == nullptr || node->device != device) return fail(ENOENT);
+  if (node == nullptr || node->device != device) return fakeFailure(ENOENT);
   return node->fileID;
 }
 
@@ -36,8 +31,8 @@ Result<DocumentID> FakeVerstow::allocate(FakeNode& node, std::string_view path) 
   const bool isDocument =
       node.kind == FileKind::RegularFile || isFakePackage(_types, node, splitFakePath(path).second);
   if (!isDocument) throw std::logic_error("only documents have document IDs");
-  if (_allocationError != 0) return fail(_allocationError);
-  if (node.device != FakeTree::kDevice) return fail(EXDEV);
+  if (_allocationError != 0) return fakeFailure(_allocationError);
+  if (node.device != FakeTree::kDevice) return fakeFailure(EXDEV);
   ++_allocations;
   return _tree.allocateDocumentID(node);
 }
