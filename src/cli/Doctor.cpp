@@ -33,12 +33,15 @@ Json pathsIn(const std::vector<std::string>& paths) {
   return list;
 }
 
-// "yes", "no", or why it cannot be told.
-std::string attributesWorkAt(const FndURL& url) {
-  const auto size = platform::services().attributes->sizeOfAttribute(url, kProbedAttribute);
-  if (size || size.error().isPosix(ENODATA)) return "yes";
-  if (size.error().isPosix(EOPNOTSUPP)) return "no: tags, ranks and dates cannot be stored here";
-  return size.error().description();
+void putAttributes(Json& report, const FndURL& root) {
+  const auto size = platform::services().attributes->sizeOfAttribute(root, kProbedAttribute);
+  const bool work = size || size.error().isPosix(ENODATA);
+  report["extendedAttributes"] = work;
+  if (work) return;
+  report["extendedAttributesProblem"] =
+      size.error().isPosix(EOPNOTSUPP)
+          ? "The volume has none: tags, ranks and dates cannot be kept."
+          : size.error().description();
 }
 
 void putStorage(Json& report, const FndURL& root) {
@@ -50,7 +53,7 @@ void putStorage(Json& report, const FndURL& root) {
   const auto uuid = services.volumes->volumeUUIDForURL(root);
   report["volumeUUID"] = uuid ? uuid->description() : uuid.error().description();
   report["fileSystemType"] = linuxos::fileSystemTypeOfPath(root.path());
-  report["extendedAttributes"] = attributesWorkAt(root);
+  putAttributes(report, root);
 }
 
 Json databaseReport(linuxos::LinuxSystem& system) {

@@ -1,3 +1,4 @@
+#include <fcntl.h>
 #include <unistd.h>
 
 #include <csignal>
@@ -13,6 +14,14 @@
 namespace {
 
 using namespace vantrell::cli;
+
+// A caller may have closed one of the three. The next file to be opened would get its number, and
+// results would be written into that file: something that cannot be written to takes its place.
+void keepStandardDescriptors() {
+  for (const int descriptor : {STDIN_FILENO, STDOUT_FILENO, STDERR_FILENO}) {
+    if (::fcntl(descriptor, F_GETFD) < 0) (void)!::open("/dev/null", O_PATH);
+  }
+}
 
 int runProgram(const std::vector<std::string>& words) {
   Output output(STDOUT_FILENO);
@@ -34,6 +43,7 @@ int runProgram(const std::vector<std::string>& words) {
 }  // namespace
 
 int main(int argc, char** argv) {
+  keepStandardDescriptors();
   // A reader who has seen enough is told apart from an error where the output is written; the
   // signal would end the program before the state folder is left in order.
   std::signal(SIGPIPE, SIG_IGN);

@@ -2,13 +2,12 @@
 
 #include <fcntl.h>
 #include <poll.h>
+#include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <array>
 #include <cstdlib>
-#include <filesystem>
-#include <sstream>
 #include <stdexcept>
 
 namespace vantrell::integration {
@@ -80,9 +79,9 @@ void readBoth(Outcome& outcome, int out, int err) {
   }
 }
 
-int endOf(pid_t child) {
+int endOf(pid_t child, rusage& usage) {
   int status = 0;
-  if (::waitpid(child, &status, 0) != child) throw std::runtime_error("no child");
+  if (::wait4(child, &status, 0, &usage) != child) throw std::runtime_error("no child");
   return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
 }
 
@@ -104,17 +103,9 @@ Outcome run(const Invocation& invocation) {
   readBoth(outcome, out.reader, err.reader);
   ::close(out.reader);
   ::close(err.reader);
-  outcome.status = endOf(child);
+  rusage usage;
+  outcome.status = endOf(child, usage);
   return outcome;
-}
-
-bool isInstalled(const std::string& program) {
-  const char* variable = std::getenv("PATH");
-  std::istringstream path(variable == nullptr ? "/usr/bin:/bin" : variable);
-  for (std::string folder; std::getline(path, folder, ':');) {
-    if (::access((folder + "/" + program).c_str(), X_OK) == 0) return true;
-  }
-  return false;
 }
 
 RunningProgram::RunningProgram(const Invocation& invocation) {
@@ -139,7 +130,9 @@ void RunningProgram::closeOutput() {
 }
 
 int RunningProgram::wait() {
-  const int status = endOf(_pid);
+  rusage usage;
+  const int status = endOf(_pid, usage);
+  _peakKilobytes = usage.ru_maxrss;
   _pid = -1;
   return status;
 }

@@ -28,9 +28,6 @@ struct Invocation {
 /// Runs the program with nothing on standard input and waits for its end.
 Outcome run(const Invocation& invocation);
 
-/// True when PATH leads to a program of that name.
-bool isInstalled(const std::string& program);
-
 /// A program that is running; it is ended when this goes.
 class RunningProgram {
  public:
@@ -46,10 +43,13 @@ class RunningProgram {
   void closeOutput();
   /// Waits for the end; as `Outcome::status`.
   int wait();
+  /// The most memory that it had at once, in kilobytes; known once `wait` has returned.
+  long peakKilobytes() const { return _peakKilobytes; }
 
  private:
   pid_t _pid = -1;
   int _output = -1;
+  long _peakKilobytes = 0;
 };
 
 }  // namespace vantrell::integration

@@ -232,7 +232,7 @@ TEST_F(Commands, DoctorTellsWhatIsRecordedAndWhere) {
   EXPECT_EQ(report["stateFolder"], stateFolder().native());
   EXPECT_THAT(report["module"], HasSubstr("libvantrell.so"));
   EXPECT_EQ(report["backend"], "looks at start only");
-  EXPECT_EQ(report["extendedAttributes"], "yes");
+  EXPECT_EQ(report["extendedAttributes"], true);
   EXPECT_THAT(report["volumeUUID"], testing::MatchesRegex("[0-9A-F-]{36}"));
   EXPECT_THAT(report["fileSystemType"], testing::Not(IsEmpty()));
   EXPECT_TRUE(report["device"].is_number_unsigned());
@@ -295,6 +295,18 @@ TEST_F(Commands, OutputThatCannotBeWrittenIsAnError) {
   const Outcome outcome = run(full);
   EXPECT_EQ(outcome.status, 1);
   EXPECT_EQ(Json::parse(outcome.err)["name"], "ENOSPC");
+}
+
+TEST_F(Commands, AClosedOutputIsAnErrorAndNothingElseIsWrittenTo) {
+  write("a.txt", "hello");
+  const Words command = {"sh", "-c", "exec \"$0\" --json ls >&-", VANTRELL_PROGRAM};
+  Invocation closed = invocation({});
+  closed.words = command;
+  const Outcome outcome = run(closed);
+  EXPECT_EQ(outcome.status, 1);
+  EXPECT_EQ(Json::parse(outcome.err)["name"], "EBADF");
+  EXPECT_EQ(contentOf(stateFolder() / "lock"), "");
+  EXPECT_EQ(vantrell({"ls"}).status, 0);
 }
 
 TEST_F(Commands, ADocumentsFolderOfAnotherNameIsFound) {
