@@ -188,6 +188,15 @@ TEST_F(DatabaseFile, AReadOnlyDatabaseIsAClearErrorAndStaysAsItIs) {
   EXPECT_EQ(bytes(state("vantrell.db")), before);
 }
 
+TEST_F(DatabaseFile, ADatabaseThatMayBeWrittenAgainIsUsedAgain) {
+  made();
+  becomeOrdinaryUser();
+  ASSERT_EQ(::chmod(state("vantrell.db").c_str(), 0400), 0);
+  EXPECT_TRUE(openingError().starts_with("can't use \"" + state("vantrell.db") + "\": "));
+  ASSERT_EQ(::chmod(state("vantrell.db").c_str(), 0600), 0);
+  EXPECT_TRUE(Catalog::open(options()));
+}
+
 TEST_F(DatabaseFile, TwoCatalogsOnOneStateFolderNeverGiveOneIDTwice) {
   for (int i = 0; i < 20; ++i) write("f" + std::to_string(i));
   look();

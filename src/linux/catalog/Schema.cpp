@@ -191,6 +191,11 @@ Result<std::optional<OpenedDatabase>> tryOpen(const std::string& path, bool isNe
   }
   auto database = Database::open(path);
   if (!database) return std::unexpected(unusableError(path, database.error()));
+  // Before the first statement: that would make a log and an index with the file's own mode,
+  // which then cannot be written even when the file can be again.
+  if ((*database)->isReadOnly()) {
+    return std::unexpected(unusableError(path, posixError(EACCES)));
+  }
   auto ready = prepareTables(**database, isNew);
   if (ready) ready = checkSoundness(**database);
   if (!ready && isDamage(**database, ready.error())) return std::nullopt;
@@ -198,9 +203,6 @@ Result<std::optional<OpenedDatabase>> tryOpen(const std::string& path, bool isNe
   const auto version = (*database)->integer("PRAGMA user_version");
   if (version && *version > kSchemaVersion) {
     return std::unexpected(newerError(path, static_cast<std::uint32_t>(*version)));
-  }
-  if ((*database)->isReadOnly()) {
-    return std::unexpected(unusableError(path, posixError(EROFS)));
   }
   if (auto marked = (*database)->execute("UPDATE state SET stoppedCleanly = 0"); !marked) {
     return std::unexpected(unusableError(path, marked.error()));
