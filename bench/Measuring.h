@@ -1,12 +1,14 @@
 #pragma once
 
-#include <sys/resource.h>
 #include <unistd.h>
 
 #include <chrono>
 #include <cstdint>
 #include <cstdio>
+#include <cstdlib>
 #include <fstream>
+#include <string>
+#include <string_view>
 
 #include "platform/foundation/FndError.h"
 
@@ -27,11 +29,16 @@ inline std::uint64_t residentBytes() {
   return resident * static_cast<std::uint64_t>(::sysconf(_SC_PAGESIZE));
 }
 
-/// The most that it ever held, in bytes.
+/// The most that it ever held, in bytes. (getrusage would count what the parent held before it
+/// became this program.)
 inline std::uint64_t peakBytes() {
-  rusage usage{};
-  ::getrusage(RUSAGE_SELF, &usage);
-  return static_cast<std::uint64_t>(usage.ru_maxrss) * 1024;
+  constexpr std::string_view kKey = "VmHWM:";
+  std::ifstream status("/proc/self/status");
+  for (std::string line; std::getline(status, line);) {
+    if (line.starts_with(kKey))
+      return std::strtoull(line.c_str() + kKey.size(), nullptr, 10) * 1024;
+  }
+  return 0;
 }
 
 /// Says what went wrong and gives the exit status of a measurement that failed.
