@@ -1,3 +1,5 @@
+#include <sys/xattr.h>
+
 #include <filesystem>
 
 #include "linux/catalog/CatalogTestStorage.h"
@@ -352,6 +354,27 @@ TEST_F(SafeSave, AttributesSetThroughThisProcessAreKeptWithoutALook) {
   look();
   EXPECT_EQ(idOf("a"), a);
   EXPECT_EQ(attribute("a", "user.com.quillon.lastuseddate#PS"), "noted");
+}
+
+TEST_F(SafeSave, AnAttributeRemovedAfterASaveDoesNotComeBackAtTheNextLook) {
+  constexpr const char* kDate = "user.com.quillon.lastuseddate#PS";
+  document("a");
+  setAttribute("a", kDate, "date");
+  look();
+  close();
+  write("new");
+  rename("new", "a");
+  look();
+  ASSERT_EQ(attribute("a", kDate), "date");
+  close();
+  ASSERT_EQ(::lremovexattr(path("a").c_str(), kDate), 0);
+  look();
+  EXPECT_EQ(attribute("a", kDate), "none");
+  close();
+  write("newer");
+  rename("newer", "a");
+  look();
+  EXPECT_EQ(attribute("a", kDate), "none");
 }
 
 TEST_F(SafeSave, AnAttributeThatWasRemovedDoesNotComeBack) {
