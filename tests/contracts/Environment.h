@@ -53,7 +53,10 @@ struct EnvironmentMaker {
 /// Every version there is.
 const std::vector<EnvironmentMaker>& environments();
 
+/// The Linux services, on an index that only remembers.
 std::unique_ptr<Environment> makeLinuxEnvironment();
+/// The Linux services on the catalog, as programs have them.
+std::unique_ptr<Environment> makeCatalogEnvironment();
 std::unique_ptr<Environment> makeFakeEnvironment();
 
 }  // namespace vantrell::testing

@@ -4,6 +4,7 @@ namespace vantrell::testing {
 
 const std::vector<EnvironmentMaker>& environments() {
   static const std::vector<EnvironmentMaker> kAll = {{"Linux", makeLinuxEnvironment},
+                                                     {"LinuxWithCatalog", makeCatalogEnvironment},
                                                      {"Fake", makeFakeEnvironment}};
   return kAll;
 }

@@ -1,8 +1,10 @@
 #include <sys/stat.h>
 
 #include <filesystem>
+#include <functional>
 #include <stdexcept>
 
+#include "linux/catalog/Catalog.h"
 #include "linux/filesystem/LinuxExtendedAttributes.h"
 #include "linux/filesystem/LinuxFileSystem.h"
 #include "linux/filesystem/LinuxVerstow.h"
@@ -17,14 +19,48 @@ namespace {
 
 namespace fs = std::filesystem;
 
+/// The index behind the services, and how it is made to look at a folder.
+struct Index {
+  std::unique_ptr<linuxos::FileIndex> index;
+  std::function<void(const std::string& path)> look;
+};
+
+Index makeFakeIndex(const std::string& storage) {
+  auto index = std::make_unique<fakes::FakeFileIndex>(storage);
+  auto* fake = index.get();
+  return {std::move(index), [fake](const std::string& path) {
+            struct stat status;
+            if (::stat(path.c_str(), &status) != 0) throw std::runtime_error("no " + path);
+            const auto entries = std::distance(fs::directory_iterator(path), {});
+            fake->setEntryCount(FileID{status.st_ino}, static_cast<std::uint64_t>(entries));
+          }};
+}
+
+Index makeCatalog(const std::string& storage, const std::string& state, const TypeRegistry& types) {
+  auto opened = linuxos::Catalog::open(
+      {.stateFolder = state, .roots = {storage}, .types = types, .log = nullptr});
+  if (!opened) throw std::runtime_error(opened.error().description());
+  auto* catalog = opened->get();
+  const auto look = [catalog] {
+    if (const auto done = catalog->look(); !done) {
+      throw std::runtime_error(done.error().description());
+    }
+  };
+  look();
+  return {*std::move(opened), [look](const std::string&) { look(); }};
+}
+
+enum class IndexKind { Fake, Catalog };
+
 class LinuxEnvironment : public Environment {
  public:
-  LinuxEnvironment()
+  explicit LinuxEnvironment(IndexKind kind)
       : _types(declareTypes()),
-        _index(_storage.path()),
-        _fileSystem(_index, _types),
-        _volumes(_index, _storage.path()),
-        _verstow(_index, _types, _storage.path()) {}
+        _index(kind == IndexKind::Fake ? makeFakeIndex(_storage.path())
+                                       : makeCatalog(_storage.path(), _state.path(), _types)),
+        _fileSystem(*_index.index, _types),
+        _volumes(*_index.index, _storage.path()),
+        _verstow(*_index.index, _types, _storage.path()) {}
 
   FileSystem& fileSystem() override { return _fileSystem; }
   ExtendedAttributes& attributes() override { return _attributes; }
@@ -48,13 +84,7 @@ class LinuxEnvironment : public Environment {
   void setMode(const std::string& path, unsigned mode) override {
     fs::permissions(root() + path, static_cast<fs::perms>(mode));
   }
-  void catalogue(const std::string& path) override {
-    struct stat status;
-    if (::stat((root() + path).c_str(), &status) != 0) throw std::runtime_error("no " + path);
-    const auto entries = fs::directory_iterator(root() + path);
-    _index.setEntryCount(FileID{status.st_ino},
-                         static_cast<std::uint64_t>(std::distance(begin(entries), end(entries))));
-  }
+  void catalogue(const std::string& path) override { _index.look(root() + path); }
 
  private:
   linuxos::TypeFolders declareTypes() {
@@ -70,8 +100,9 @@ class LinuxEnvironment : public Environment {
   AsOrdinaryUser _ordinary;  // first: everything is made, used and removed as one
   TemporaryFolder _storage;
   TemporaryFolder _data;
+  TemporaryFolder _state;
   linuxos::SharedMimeTypes _types;
-  fakes::FakeFileIndex _index;
+  Index _index;
   linuxos::LinuxFileSystem _fileSystem;
   linuxos::LinuxExtendedAttributes _attributes;
   linuxos::LinuxVolumes _volumes;
@@ -80,6 +111,12 @@ class LinuxEnvironment : public Environment {
 
 }  // namespace
 
-std::unique_ptr<Environment> makeLinuxEnvironment() { return std::make_unique<LinuxEnvironment>(); }
+std::unique_ptr<Environment> makeLinuxEnvironment() {
+  return std::make_unique<LinuxEnvironment>(IndexKind::Fake);
+}
+
+std::unique_ptr<Environment> makeCatalogEnvironment() {
+  return std::make_unique<LinuxEnvironment>(IndexKind::Catalog);
+}
 
 }  // namespace vantrell::testing

@@ -61,6 +61,7 @@ Result<DocumentID> LinuxVerstow::documentID(const SeenObject& object, bool alloc
   if (!folder) return std::unexpected(posixError(folder.error()));
   const auto ids = _index.documentIDsOfObjects(folder->fileID, {&object, 1});
   if (!ids) return std::unexpected(ids.error());
+  if (ids->front().value == 0) return std::unexpected(posixError(ENOENT));  // gone meanwhile
   return ids->front();
 }
 

@@ -157,8 +157,8 @@ TEST(FileLogSink, AWriteThatFailsLosesItsLineAndNothingElse) {
   ASSERT_EQ(::setrlimit(RLIMIT_FSIZE, &whole), 0);
   std::signal(SIGXFSZ, oldHandler);
   sink.write(line("after"));
-  EXPECT_EQ(contents(path), logFileLine(line("before"), clock.now()) +
-                                logFileLine(line("after"), clock.now()));
+  EXPECT_EQ(contents(path),
+            logFileLine(line("before"), clock.now()) + logFileLine(line("after"), clock.now()));
 }
 
 TEST(FileLogSink, AFifoInItsPlaceDoesNotBlock) {
