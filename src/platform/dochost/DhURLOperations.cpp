@@ -36,13 +36,13 @@ bool flag(const FndURL& url, FndURLResourceKey key) {
 }  // namespace
 
 DhURLRelationship dh_relationshipToItemAtURL(const FndURL& folder, const FndURL& item) {
-  if (!folder.isFileURL() || !item.isFileURL()) {
-    return folder == item ? DhURLRelationship::Same : DhURLRelationship::Other;
+  if (folder.hasParentReference() || item.hasParentReference()) {
+    return relationshipOfPaths(canonical(folder).path(), canonical(item).path());
   }
-  if (!folder.hasParentReference() && !item.hasParentReference()) {
+  if (folder.isFileURL() && item.isFileURL()) {
     return relationshipOfPaths(folder.path(), item.path());
   }
-  return relationshipOfPaths(canonical(folder).path(), canonical(item).path());
+  return folder == item ? DhURLRelationship::Same : DhURLRelationship::Other;
 }
 
 bool dh_isFolder(const FndURL& url) {

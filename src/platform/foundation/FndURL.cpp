@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <array>
-#include <mutex>
 #include <utility>
 
 #include "platform/foundation/UnicodeText.h"
@@ -69,14 +68,6 @@ bool isControl(std::string_view character) {
 
 }  // namespace
 
-struct FndURL::Object {
-  std::string text;  // the path of a file URL, the whole text of any other
-  bool isFile = true;
-  bool hasParentReference = false;
-  std::mutex mutex;
-  std::vector<std::pair<FndURLResourceKey, ResourceValue>> values;  // guarded by mutex
-};
-
 std::string_view resourceKeyName(FndURLResourceKey key) {
   static constexpr std::array<std::string_view, 14> kNames = {"FndURLParentDirectoryURLKey",
                                                               "FndURLNameKey",
@@ -97,7 +88,7 @@ std::string_view resourceKeyName(FndURLResourceKey key) {
 
 FndURL FndURL::fileURLWithPath(std::string_view path) {
   auto object = std::make_shared<Object>();
-  std::string& clean = object->text;
+  std::string& clean = object->path;
   clean.reserve(path.size() + 1);
   forEachComponent(path, [&clean, &object](std::string_view component) {
     clean += '/';
@@ -120,18 +111,8 @@ std::optional<FndURL> FndURL::URLWithString(std::string_view text) {
   if (!hasScheme(text)) return std::nullopt;
   auto object = std::make_shared<Object>();
   object->text = text;
-  object->isFile = false;
   return FndURL(std::move(object));
 }
-
-bool FndURL::isFileURL() const { return _object->isFile; }
-
-const std::string& FndURL::path() const {
-  static const std::string kNone;
-  return _object->isFile ? _object->text : kNone;
-}
-
-bool FndURL::hasParentReference() const { return _object->hasParentReference; }
 
 std::string FndURL::standardizedPath() const {
   std::vector<std::string_view> kept;
@@ -152,7 +133,7 @@ std::string FndURL::standardizedPath() const {
 }
 
 std::string_view FndURL::lastPathComponent() const {
-  const std::string_view text = _object->text;
+  const std::string_view text = isFileURL() ? path() : _object->text;
   const std::size_t slash = text.rfind('/');
   if (slash == std::string_view::npos || text.size() == 1) return text;
   return text.substr(slash + 1);
@@ -198,7 +179,7 @@ std::string FndURL::description() const {
 }
 
 std::optional<FndURL::ResourceValue> FndURL::cachedResourceValue(FndURLResourceKey key) const {
-  const std::lock_guard lock(_object->mutex);
+  const MutexLock lock(_object->mutex);
   for (const auto& [known, value] : _object->values) {
     if (known == key) return value;
   }
@@ -206,7 +187,7 @@ std::optional<FndURL::ResourceValue> FndURL::cachedResourceValue(FndURLResourceK
 }
 
 void FndURL::setCachedResourceValue(FndURLResourceKey key, ResourceValue value) const {
-  const std::lock_guard lock(_object->mutex);
+  const MutexLock lock(_object->mutex);
   for (auto& [known, old] : _object->values) {
     if (known != key) continue;
     old = std::move(value);
@@ -216,13 +197,12 @@ void FndURL::setCachedResourceValue(FndURLResourceKey key, ResourceValue value) 
 }
 
 bool operator==(const FndURL& a, const FndURL& b) {
-  return a._object == b._object ||
-         (a._object->isFile == b._object->isFile && a._object->text == b._object->text);
+  return a._object == b._object || (a.path() == b.path() && a._object->text == b._object->text);
 }
 
 bool operator<(const FndURL& a, const FndURL& b) {
-  if (a._object->isFile != b._object->isFile) return a._object->isFile;
-  return a._object->text < b._object->text;
+  if (a.isFileURL() != b.isFileURL()) return a.isFileURL();
+  return a.isFileURL() ? a.path() < b.path() : a._object->text < b._object->text;
 }
 
 std::string displayText(std::string_view bytes) {

@@ -4,12 +4,14 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <variant>
 #include <vector>
 
 #include "platform/foundation/FndData.h"
 #include "platform/foundation/FndDate.h"
 #include "platform/foundation/FndNumber.h"
+#include "platform/foundation/Mutex.h"
 
 namespace vantrell {
 
@@ -52,11 +54,11 @@ class FndURL {
   /// NUL in a path.
   static std::optional<FndURL> URLWithString(std::string_view text);
 
-  bool isFileURL() const;
+  bool isFileURL() const { return !_object->path.empty(); }
   /// Absolute, without trailing slash; empty for another scheme.
-  const std::string& path() const;
+  const std::string& path() const { return _object->path; }
   /// True when a component is "..": where the path leads is then known to the disk alone.
-  bool hasParentReference() const;
+  bool hasParentReference() const { return _object->hasParentReference; }
   /// The path with "." and ".." folded by its text alone.
   std::string standardizedPath() const;
   /// "/" for the root. The view lives as long as the URL object.
@@ -81,7 +83,14 @@ class FndURL {
   friend bool operator<(const FndURL& a, const FndURL& b);
 
  private:
-  struct Object;
+  // Stands here so that a path costs no call: it is asked for once for each item and each root.
+  struct Object {
+    std::string path;  // of a file URL
+    std::string text;  // of any other, the whole of it
+    bool hasParentReference = false;
+    Mutex mutex;
+    std::vector<std::pair<FndURLResourceKey, ResourceValue>> values VANTRELL_GUARDED_BY(mutex);
+  };
   explicit FndURL(std::shared_ptr<Object> object) : _object(std::move(object)) {}
 
   std::shared_ptr<Object> _object;
