@@ -23,15 +23,26 @@ OsResult<void> giveAttributes(const Place& place, const Document& document,
   return setMissingAttributes(file->get(), attributes);
 }
 
-/// Setting an attribute has changed the file's ctime, which is no news to anybody.
+/// Setting an attribute has changed the file's ctime, which is no news to anybody, under none of
+/// its names.
 Result<void> catalogueAgain(Store& store, const Place& place, const Document& document,
                             const FolderRules& rules) {
   const FolderReader reader(place.folder.get(), rules);
   const auto seen = reader.lookAt(std::string(place.name));
   if (!seen || !*seen || (*seen)->fileID != document.object.fileID) return {};
-  Entry entry = **seen;
-  entry.generation = document.object.generation;
-  return store.entries.put(document.home.parent, entry);
+  const auto names = store.entries.placesOfFileID(document.object.fileID);
+  if (!names) return std::unexpected(names.error());
+  for (PlacedEntry placed : *names) {
+    if (placed.entry.object() != document.object) continue;
+    placed.entry.size = (*seen)->size;
+    placed.entry.modifiedNanoseconds = (*seen)->modifiedNanoseconds;
+    placed.entry.changedNanoseconds = (*seen)->changedNanoseconds;
+    if ((*seen)->kind.isRecent()) {
+      placed.entry.kind = placed.entry.kind.with(EntryKind::kRecent);
+    }
+    if (auto put = store.entries.put(placed.parent, placed.entry); !put) return put;
+  }
+  return {};
 }
 
 Result<void> pay(Store& store, const std::string& path, Document document, const FolderRules& rules,
