@@ -139,15 +139,14 @@ Result<void> createTables(Database& database) {
   return transaction->commit();
 }
 
-/// Another process may have made the tables since the file was inspected.
-Result<void> prepareTables(Database& database, bool isNew) {
+/// Another process may have made the tables since the file was inspected; and a process that died
+/// while it made them left a header that its journal has just taken back.
+Result<void> prepareTables(Database& database) {
   if (auto done = database.execute(kConnectionSettings); !done) return done;
-  if (isNew) {
-    const auto tables = database.integer("SELECT count(*) FROM sqlite_schema");
-    if (!tables) return std::unexpected(tables.error());
-    if (*tables == 0) {
-      if (auto done = createTables(database); !done) return done;
-    }
+  const auto tables = database.integer("SELECT count(*) FROM sqlite_schema");
+  if (!tables) return std::unexpected(tables.error());
+  if (*tables == 0) {
+    if (auto done = createTables(database); !done) return done;
   }
   return database.execute("PRAGMA journal_mode = WAL");
 }
@@ -196,7 +195,7 @@ Result<std::optional<OpenedDatabase>> tryOpen(const std::string& path, bool isNe
   if ((*database)->isReadOnly()) {
     return std::unexpected(unusableError(path, posixError(EACCES)));
   }
-  auto ready = prepareTables(**database, isNew);
+  auto ready = prepareTables(**database);
   if (ready) ready = checkSoundness(**database);
   if (!ready && isDamage(**database, ready.error())) return std::nullopt;
   if (!ready) return std::unexpected(unusableError(path, ready.error()));
