@@ -68,6 +68,17 @@ bool isPartOfVantrell(const FndURL& url, std::optional<FndURL>& libraryRoot) {
   return false;
 }
 
+// An identifier names no volume: the number of an object on another one would be misread as the
+// storage's own object of that number.
+bool isOnStorageVolume(const FndURL& url, OpenFile& file) {
+  const DeviceID storage = deviceID(platform::services().manager->documentStorageURL());
+  if (file.deviceID().value_or(DeviceID{}) == storage) return true;
+  logIdentity(
+      LogLevel::Debug, "can't compute file object identifier because \"",
+      [&url] { return url.standardizedPath(); }, "\" is not on the volume of the storage");
+  return false;
+}
+
 DochostItemIdentifier identifierOfFolderLike(const FndURL& url, FileID fileID) {
   url.setCachedResourceValue(FndURLResourceKey::FileResourceIdentifier, FndNumber(fileID.value));
   return ZubFileObjectIdentifier::fromFileID(fileID);
@@ -113,6 +124,7 @@ std::optional<DochostItemIdentifier> identifierFromFileSystem(const FndURL& url)
   }
   const bool isDocument = identity->kind == FileKind::RegularFile ||
                           (identity->kind == FileKind::Directory && isPackage);
+  if (!isOnStorageVolume(url, **file)) return std::nullopt;
   if (!isDocument) return identifierOfFolderLike(url, identity->fileID);
   return identifierOfDocument(url, **file, identity->documentID);
 }

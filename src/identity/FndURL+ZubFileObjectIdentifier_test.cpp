@@ -52,6 +52,16 @@ TEST_F(
   EXPECT_EQ(idOf("link"), fid(system.tree.fileID(system.inStorage("link"))));
 }
 
+TEST_F(ItemIdentifierTest, WhatLiesOnAnotherVolumeInsideTheStorageHasNoIdentifier) {
+  system.folder("mounted");
+  system.tree.makeLink(system.inStorage("mounted/link"), "a.txt");
+  system.tree.mount(system.inStorage("mounted"), DeviceID{77});
+  const FndURL link = system.urlInStorage("mounted/link");
+  expectNone(link, LogLevel::Debug,
+             "can't compute file object identifier because \"" + link.path() +
+                 "\" is not on the volume of the storage");
+}
+
 TEST_F(ItemIdentifierTest, ARegularFileIsGivenADocumentIDOnce) {
   system.file("a.txt");
   const std::string first = idOf("a.txt");

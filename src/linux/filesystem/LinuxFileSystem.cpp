@@ -43,8 +43,9 @@ int enterOrMake(FileDescriptor& folder, const std::string& name) {
 
 }  // namespace
 
-LinuxFileSystem::LinuxFileSystem(FileIndex& index, const TypeRegistry& types)
-    : _index(index), _types(types) {}
+LinuxFileSystem::LinuxFileSystem(FileIndex& index, const TypeRegistry& types,
+                                 std::optional<DeviceID> storageDevice)
+    : _index(index), _types(types), _storageDevice(storageDevice) {}
 
 Result<void> LinuxFileSystem::readResourceValues(const FndURL& url, std::span<const Key> keys) {
   const auto spot = ObjectSpot::of(url);
@@ -71,7 +72,9 @@ Result<void> LinuxFileSystem::readResourceValues(const FndURL& url, std::span<co
     _index.noteSeen(object);
   }
   const FndURL parent = url.URLByDeletingLastPathComponent();
+  const bool isNumbered = !_storageDevice || status->device == *_storageDevice;
   for (const Key key : keys) {
+    if (key == Key::FileResourceIdentifier && !isNumbered) continue;
     auto value = makeResourceValue(key, url, parent, view);
     if (value) url.setCachedResourceValue(key, *std::move(value));
   }

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <optional>
+
 #include "linux/catalog/FileIndex.h"
 #include "platform/filesystem/FileSystem.h"
 #include "platform/types/TypeRegistry.h"
@@ -13,7 +15,9 @@ namespace vantrell::linuxos {
 /// Lifetime: borrows the index and the types, which must outlive it and what it gives out.
 class LinuxFileSystem : public FileSystem {
  public:
-  LinuxFileSystem(FileIndex& index, const TypeRegistry& types);
+  /// Objects outside `storageDevice`, if given, get no file ID: identifiers carry no device.
+  LinuxFileSystem(FileIndex& index, const TypeRegistry& types,
+                  std::optional<DeviceID> storageDevice = std::nullopt);
 
   Result<void> readResourceValues(const FndURL& url,
                                   std::span<const FndURLResourceKey> keys) override;
@@ -29,6 +33,7 @@ class LinuxFileSystem : public FileSystem {
  private:
   FileIndex& _index;
   const TypeRegistry& _types;
+  const std::optional<DeviceID> _storageDevice;
 };
 
 }  // namespace vantrell::linuxos

@@ -1,5 +1,7 @@
 #include "linux/system/LinuxSystem.h"
 
+#include <fcntl.h>
+
 #include <utility>
 
 #include "linux/devinfo/LinuxDevinfo.h"
@@ -7,6 +9,7 @@
 #include "linux/filesystem/LinuxFileSystem.h"
 #include "linux/filesystem/LinuxVerstow.h"
 #include "linux/filesystem/LinuxVolumes.h"
+#include "linux/filesystem/ObjectStatus.h"
 #include "linux/filesystem/SystemClock.h"
 #include "linux/log/MakeLogSink.h"
 #include "linux/system/StateFolder.h"
@@ -40,7 +43,8 @@ struct LinuxSystem::Parts {
   // Second step: the catalog can fail, and what comes after it borrows it.
   void serve(std::unique_ptr<Catalog> opened, const std::string& storageRoot) {
     catalog = std::move(opened);
-    fileSystem.emplace(*catalog, types);
+    const auto root = lookAt(AT_FDCWD, storageRoot.c_str());
+    fileSystem.emplace(*catalog, types, root ? std::optional(root->device) : std::nullopt);
     volumes.emplace(*catalog, storageRoot);
     verstow.emplace(*catalog, types, storageRoot);
   }
