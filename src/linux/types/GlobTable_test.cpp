@@ -58,7 +58,9 @@ TEST(GlobTable, SuffixesNeedNoDot) {
 }
 
 TEST(GlobTable, ANameLongerThanAnyFilesIsJudgedByItsEnd) {
-  EXPECT_EQ(typeOf({{50, "a/x", "*.x", false}}, std::string(5000, 'n') + ".X"), "a/x");
+  std::string name(5000, 'n');
+  name += ".X";
+  EXPECT_EQ(typeOf({{50, "a/x", "*.x", false}}, name), "a/x");
 }
 
 TEST(GlobTable, NamesThatAreNoUTF8HaveTypesToo) {
