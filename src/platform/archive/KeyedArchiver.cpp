@@ -27,8 +27,10 @@ struct ArchiveShape {
       }
       return;
     }
-    const auto* dictionary = value.dictionary();
-    for (const auto& [key, element] : dictionary ? *dictionary : value.record()->fields) {
+    const auto* fields = value.dictionary();
+    if (const auto* record = value.record()) fields = &record->fields;
+    if (fields == nullptr) return;
+    for (const auto& [key, element] : *fields) {
       if (!each(element)) return;
     }
   }
