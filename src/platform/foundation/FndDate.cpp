@@ -79,7 +79,7 @@ std::optional<std::int64_t> zoneOffset(std::string_view& text) {
   if (!hours || *hours > 23 || !take(text, ":")) return std::nullopt;
   const auto minutes = digits(text, 2);
   if (!minutes || *minutes > 59) return std::nullopt;
-  const std::int64_t seconds = (*hours * 60 + *minutes) * 60;
+  const std::int64_t seconds = std::int64_t{*hours * 60 + *minutes} * 60;
   return west ? -seconds : seconds;
 }
 
